@@ -1,0 +1,16 @@
+#pragma once
+
+#include "itunesdb/chunk_reader.h"
+#include "itunesdb/db_chunk.h"
+
+namespace kestrune::itunesdb {
+
+// Builds the node for an already read record and, reading them from `reader`, the nodes of all
+// its descendants. Throws MalformedDatabase when the records do not fit together.
+DbChunk ParseChunk(RecordBytes record, DbChunkReader& reader, ChunkContext context);
+
+// Reads the first record from `reader` and parses the whole tree below it. Throws
+// MalformedDatabase when the source ends inside that record.
+DbChunk ParseDatabase(DbChunkReader& reader);
+
+}  // namespace kestrune::itunesdb
