@@ -39,13 +39,14 @@ class ParseTest : public ::testing::Test {
     const auto path = folder_ / "iTunesDB";
     test::WriteBytes(path, bytes);
     FileHandle file = OpenForReading(path);
-    FileChunkReader reader(file.get());
-    DbChunk root = ParseDatabase(reader);
+    FileChunkReader reader(file.get(), arena_);
+    DbChunk root = ParseDatabase(reader, arena_);
     endPosition_ = reader.Tell();
     return root;
   }
 
   test::TempFolder folder_;
+  RecordArena arena_;
   std::int32_t endPosition_ = -1;
 };
 
@@ -206,7 +207,7 @@ TEST_F(ParseTest, ReadChunkStopsAtTheHeaderOrAtTheEndOfAStringRecord) {
   const Bytes bytes = Concat({Mhsd(1, {mkipod::StringMhod(1, u"ab")})});
   test::WriteBytes(folder_ / "records", bytes);
   FileHandle file = OpenForReading(folder_ / "records");
-  FileChunkReader reader(file.get());
+  FileChunkReader reader(file.get(), arena_);
   ASSERT_TRUE(reader.ReadChunk().has_value());
   EXPECT_EQ(reader.Tell(), 96);
   const auto mhod = reader.ReadChunk();
