@@ -57,7 +57,10 @@ void LibgpodParseFile(benchmark::State& state) {
 }
 
 BENCHMARK(LoadDatabase)->Unit(benchmark::kMillisecond)->Repetitions(7)->ReportAggregatesOnly(true);
-BENCHMARK(LibgpodParseFile)->Unit(benchmark::kMillisecond)->Repetitions(7)->ReportAggregatesOnly(true);
+BENCHMARK(LibgpodParseFile)
+    ->Unit(benchmark::kMillisecond)
+    ->Repetitions(7)
+    ->ReportAggregatesOnly(true);
 
 long StatusKilobytes(const char* field) {
   std::ifstream status("/proc/self/status");
@@ -76,7 +79,8 @@ int PrintPeakMemory(bool libgpod) {
     Itdb_iTunesDB* db = itdb_parse_file(DatabaseFile().string().c_str(), nullptr);
     if (db == nullptr) return 1;
     tracks = itdb_tracks_number(db);
-    std::cout << (libgpod ? "libgpod" : "") << " loaded: resident " << StatusKilobytes("VmRSS:") << " kB\n";
+    std::cout << (libgpod ? "libgpod" : "") << " loaded: resident " << StatusKilobytes("VmRSS:")
+              << " kB\n";
     itdb_free(db);
   } else {
     TrackLibrary library(TextFromPath(g_device));

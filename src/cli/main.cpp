@@ -33,7 +33,8 @@ int Run(const std::vector<std::u16string>& arguments) {
       return cli::RunDevices(*platform::MakeSystemDrives(first), std::cout, std::cerr);
     }
     case cli::Command::kList: {
-      if (!options->device) return cli::RunList(*options, *platform::MakeSystemDrives(), std::cout, std::cerr);
+      if (!options->device)
+        return cli::RunList(*options, *platform::MakeSystemDrives(), std::cout, std::cerr);
       // A device folder named on the command line is the only place looked at.
       platform::FolderDrives folder;
       folder.AddFolder(PathFromText(*options->device));

@@ -11,7 +11,8 @@ const char* const kUsage =
     "usage: kestrune-cli devices\n"
     "       kestrune-cli list [--device DIR] [--playlist INDEX] [--json]\n";
 
-std::optional<Options> ParseOptions(const std::vector<std::u16string>& arguments, std::string& error) {
+std::optional<Options> ParseOptions(const std::vector<std::u16string>& arguments,
+                                    std::string& error) {
   Options options;
   if (arguments.empty()) return options;
   const std::u16string& command = arguments.front();

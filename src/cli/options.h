@@ -11,13 +11,14 @@ enum class Command { kHelp, kDevices, kList };
 
 struct Options {
   Command command = Command::kHelp;
-  std::optional<std::u16string> device;    // --device DIR
-  std::optional<std::int32_t> playlist;    // --playlist INDEX, -1 for the whole device
-  bool json = false;                       // --json
+  std::optional<std::u16string> device;  // --device DIR
+  std::optional<std::int32_t> playlist;  // --playlist INDEX, -1 for the whole device
+  bool json = false;                     // --json
 };
 
 // Parses the arguments after the program name; on a mistake `error` says what is wrong.
-std::optional<Options> ParseOptions(const std::vector<std::u16string>& arguments, std::string& error);
+std::optional<Options> ParseOptions(const std::vector<std::u16string>& arguments,
+                                    std::string& error);
 
 extern const char* const kUsage;
 

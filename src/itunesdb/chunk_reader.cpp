@@ -39,7 +39,8 @@ bool FileChunkReader::ReadThroughWindow(unsigned char* into, std::size_t count) 
       continue;
     }
     if (streamPosition_ != position_ && std::fseek(stream_, position_, SEEK_SET) != 0) return false;
-    if (window_.empty()) window_.resize(static_cast<std::size_t>(std::clamp<long>(fileSize_, 1, kReadAhead)));
+    if (window_.empty())
+      window_.resize(static_cast<std::size_t>(std::clamp<long>(fileSize_, 1, kReadAhead)));
     const std::size_t got = std::fread(window_.data(), 1, window_.size(), stream_);
     windowFill_ = got;
     windowStart_ = position_;
@@ -80,7 +81,9 @@ std::optional<RecordBytes> FileChunkReader::ReadChunk() {
 void FileChunkReader::Skip(std::int32_t offset) { Seek(offset, SeekOrigin::kCurrent); }
 
 void FileChunkReader::Seek(std::int32_t offset, SeekOrigin origin) {
-  const long base = origin == SeekOrigin::kBegin ? 0 : origin == SeekOrigin::kCurrent ? position_ : fileSize_;
+  const long base = origin == SeekOrigin::kBegin     ? 0
+                    : origin == SeekOrigin::kCurrent ? position_
+                                                     : fileSize_;
   // Nothing moves until the next read; a position before the file's start is refused there.
   position_ = base + offset;
 }

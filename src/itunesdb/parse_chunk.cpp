@@ -97,9 +97,11 @@ class TreeBuilder {
 
 }  // namespace
 
-DbChunk ParseChunk(RecordBytes record, DbChunkReader& reader, ChunkContext context, RecordArena& arena) {
+DbChunk ParseChunk(RecordBytes record, DbChunkReader& reader, ChunkContext context,
+                   RecordArena& arena) {
   TreeBuilder builder(reader, arena);
-  const std::int64_t offset = std::int64_t{reader.Tell()} - static_cast<std::int64_t>(record.size());
+  const std::int64_t offset =
+      std::int64_t{reader.Tell()} - static_cast<std::int64_t>(record.size());
   return builder.Parse(record, context, 0, offset);
 }
 

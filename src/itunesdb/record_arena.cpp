@@ -2,7 +2,6 @@
 
 #include <algorithm>
 
-
 namespace kestrune::itunesdb {
 
 void* RecordArena::AllocateFromNewBlock(std::size_t bytes) {
@@ -13,7 +12,8 @@ void* RecordArena::AllocateFromNewBlock(std::size_t bytes) {
     return blocks_.back().get();
   }
   // Blocks grow from small to large, so that small trees stay small.
-  const std::size_t blockSize = std::min(kLargestBlock, kFirstBlock << std::min<std::size_t>(blocks_.size(), 8));
+  const std::size_t blockSize =
+      std::min(kLargestBlock, kFirstBlock << std::min<std::size_t>(blocks_.size(), 8));
   blocks_.push_back(std::make_unique_for_overwrite<std::byte[]>(std::max(blockSize, bytes)));
   next_ = blocks_.back().get() + bytes;
   left_ = std::max(blockSize, bytes) - bytes;

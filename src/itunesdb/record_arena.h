@@ -19,7 +19,8 @@ class RecordArena {
   // Uninitialized memory that stays put until the arena is destroyed. `alignment` is a power
   // of two.
   void* Allocate(std::size_t bytes, std::size_t alignment) {
-    const std::size_t padding = (alignment - reinterpret_cast<std::uintptr_t>(next_)) & (alignment - 1);
+    const std::size_t padding =
+        (alignment - reinterpret_cast<std::uintptr_t>(next_)) & (alignment - 1);
     if (padding + bytes <= left_) [[likely]] {
       std::byte* result = next_ + padding;
       next_ = result + bytes;

@@ -148,8 +148,8 @@ TEST_F(ParseTest, UnknownTagsKeepOnlyTheirHeader) {
 TEST_F(ParseTest, RefusesFilesThatEndInsideARecord) {
   const Bytes whole = Mhbd({Mhsd(1, {mkipod::RecordBuilder("mhlt", 92).AsList()})});
   // Inside the first 8 bytes of a record, inside a header, at the end of the data.
-  for (std::size_t cut : {std::size_t{3}, std::size_t{50}, std::size_t{104 + 4}, std::size_t{104 + 60},
-                          whole.size() - 1}) {
+  for (std::size_t cut : {std::size_t{3}, std::size_t{50}, std::size_t{104 + 4},
+                          std::size_t{104 + 60}, whole.size() - 1}) {
     Bytes truncated(whole.begin(), whole.begin() + static_cast<std::ptrdiff_t>(cut));
     EXPECT_THROW(Parse(truncated), MalformedDatabase) << "cut at " << cut;
   }
