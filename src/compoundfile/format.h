@@ -10,7 +10,7 @@ namespace kestrune::compoundfile {
 // The layout of a compound file (OLE structured storage) that the reader and the writer share.
 
 inline constexpr std::array<unsigned char, 8> kSignature = {0xD0, 0xCF, 0x11, 0xE0,
-                                                           0xA1, 0xB1, 0x1A, 0xE1};
+                                                            0xA1, 0xB1, 0x1A, 0xE1};
 inline constexpr std::size_t kHeaderSize = 512;
 inline constexpr std::size_t kSectorSize = 512;  // version 3; the header fills sector -1
 inline constexpr std::size_t kMiniSectorSize = 64;

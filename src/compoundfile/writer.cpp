@@ -45,8 +45,8 @@ struct TreeLinks {
 // Each range's middle entry becomes its root, so the paths to the tree's empty leaves differ in
 // length by one at most. Colouring the deepest level red when it is not full gives every path
 // the same number of black entries: a valid red-black tree, which readers may expect.
-std::uint32_t LinkTree(std::vector<TreeLinks>& links, std::size_t begin, std::size_t end,
-                       int depth, int redDepth) {
+std::uint32_t LinkTree(std::vector<TreeLinks>& links, std::size_t begin, std::size_t end, int depth,
+                       int redDepth) {
   if (begin == end) return kNoEntry;
   const std::size_t middle = begin + (end - begin) / 2;
   links[middle].left = LinkTree(links, begin, middle, depth + 1, redDepth);
@@ -103,9 +103,8 @@ std::uint32_t LinkRun(std::vector<std::uint32_t>& table, std::size_t first, std:
   return static_cast<std::uint32_t>(first);
 }
 
-void WriteEntry(unsigned char* at, std::u16string_view name, EntryType type,
-                const TreeLinks& links, std::uint32_t child, std::uint32_t start,
-                std::uint64_t size) {
+void WriteEntry(unsigned char* at, std::u16string_view name, EntryType type, const TreeLinks& links,
+                std::uint32_t child, std::uint32_t start, std::uint64_t size) {
   for (std::size_t i = 0; i < name.size(); ++i) StoreU16Le(at + entry::kName + 2 * i, name[i]);
   StoreU16Le(at + entry::kNameLength, static_cast<std::uint16_t>(2 * (name.size() + 1)));
   at[entry::kType] = static_cast<unsigned char>(type);

@@ -24,8 +24,12 @@ class BrokenFile : public ::testing::Test {
 
   std::uint32_t Get(std::size_t at) const { return LoadU32Le(file_.data() + at); }
   void Put(std::size_t at, std::uint32_t value) { StoreU32Le(file_.data() + at, value); }
-  static std::size_t Sector(std::uint32_t sector) { return (sector + std::size_t{1}) * kSectorSize; }
-  std::uint32_t SectorCount() const { return static_cast<std::uint32_t>(file_.size() / kSectorSize - 1); }
+  static std::size_t Sector(std::uint32_t sector) {
+    return (sector + std::size_t{1}) * kSectorSize;
+  }
+  std::uint32_t SectorCount() const {
+    return static_cast<std::uint32_t>(file_.size() / kSectorSize - 1);
+  }
 
   std::size_t Entry(std::uint32_t id) const {
     return Sector(Get(header::kFirstDirectorySector)) + id * kDirectoryEntrySize;
@@ -71,9 +75,9 @@ TEST_F(BrokenFile, AnythingButAVersion3HeaderIsRefused) {
     EXPECT_FALSE(CompoundFileReader::Open(std::span(file_.data(), size))) << size;
   }
   const std::vector<std::pair<std::size_t, std::uint16_t>> damage = {
-      {0, 0xCFD1},                           // signature
-      {header::kByteOrder, 0xFEFF},          // big-endian mark
-      {header::kMajorVersion, 4},            // 4096-byte sectors
+      {0, 0xCFD1},                   // signature
+      {header::kByteOrder, 0xFEFF},  // big-endian mark
+      {header::kMajorVersion, 4},    // 4096-byte sectors
       {header::kSectorShift, 12},
       {header::kMiniSectorShift, 7},
       {header::kMiniStreamCutoff, 0x2000}};  // mini streams up to 8 KB
@@ -135,7 +139,7 @@ TEST_F(BrokenFile, DirectoryEntriesOutOfRangeOrInACycleAreRefused) {
   const std::uint32_t top = Get(root + entry::kChild);
   const std::uint32_t leaf = Get(Entry(top) + entry::kRightSibling);
   const std::vector<std::pair<std::size_t, std::uint32_t>> damage = {
-      {root + entry::kChild, 4},            // past the last entry
+      {root + entry::kChild, 4},  // past the last entry
       {root + entry::kChild, 0xFFFFFFF0},
       {Entry(leaf) + entry::kRightSibling, top},  // back up the tree
       {Entry(leaf) + entry::kLeftSibling, leaf},  // itself
@@ -169,11 +173,11 @@ TEST_F(BrokenFile, ADamagedChainRefusesOnlyItsOwnStream) {
   const std::uint32_t beta = StartOf(u"beta");
   const std::uint32_t alpha = StartOf(u"alpha");
   const std::vector<std::pair<std::size_t, std::uint32_t>> damage = {
-      {Fat(beta + 3), beta + 1},          // loops back
-      {Fat(beta + 2), SectorCount()},     // leaves the file
+      {Fat(beta + 3), beta + 1},       // loops back
+      {Fat(beta + 2), SectorCount()},  // leaves the file
       {Fat(beta + 2), 0xFFFF0000},
-      {Fat(beta + 2), kFreeSector},       // ends in a free sector
-      {Fat(beta + 2), kEndOfChain},       // ends before the size does
+      {Fat(beta + 2), kFreeSector},  // ends in a free sector
+      {Fat(beta + 2), kEndOfChain},  // ends before the size does
       {Entry(IdOf(u"beta")) + entry::kStartSector, SectorCount()},
       {Entry(IdOf(u"beta")) + entry::kSize, 5000 + 20 * 512},
       {Entry(IdOf(u"beta")) + entry::kSize, 0xFFFFFFFF}};
@@ -184,10 +188,10 @@ TEST_F(BrokenFile, ADamagedChainRefusesOnlyItsOwnStream) {
     file_ = intact;
   }
   const std::vector<std::pair<std::size_t, std::uint32_t>> miniDamage = {
-      {MiniFat(alpha), alpha},                                 // loops onto itself
-      {MiniFat(alpha), 1000},                                  // past the mini stream
-      {Entry(IdOf(u"alpha")) + entry::kStartSector, 8},        // first unit past it
-      {Entry(IdOf(u"alpha")) + entry::kSize, 4000}};           // more than it holds
+      {MiniFat(alpha), alpha},                           // loops onto itself
+      {MiniFat(alpha), 1000},                            // past the mini stream
+      {Entry(IdOf(u"alpha")) + entry::kStartSector, 8},  // first unit past it
+      {Entry(IdOf(u"alpha")) + entry::kSize, 4000}};     // more than it holds
   for (const auto& [at, value] : miniDamage) {
     const auto intact = file_;
     Put(at, value);

@@ -11,16 +11,10 @@
 #include "compoundfile/format.h"
 #include "compoundfile/reader.h"
 #include "compoundfile/writer.h"
+#include "support/random_bytes.h"
 
 namespace kestrune::compoundfile {
 namespace {
-
-std::vector<unsigned char> RandomBytes(std::size_t size, unsigned seed) {
-  std::mt19937 random(seed);
-  std::vector<unsigned char> bytes(size);
-  for (auto& byte : bytes) byte = static_cast<unsigned char>(random());
-  return bytes;
-}
 
 // Reads a whole stream in pieces of `step` bytes, so that reads cross sector boundaries.
 std::vector<unsigned char> ReadAll(StreamReader& stream, std::size_t step) {
@@ -38,8 +32,9 @@ TEST(CompoundFile, StreamsOfEverySizeClassReadBackWhole) {
   const std::size_t sizes[] = {0, 1, 63, 64, 65, 511, 512, 513, 4095, 4096, 4097, 42000};
   std::vector<NamedStream> streams;
   for (const std::size_t size : sizes) {
-    streams.push_back({u"s" + std::u16string(size % 7 + 1, u'x') + AsciiToUtf16(std::to_string(size)),
-                       RandomBytes(size, static_cast<unsigned>(size))});
+    streams.push_back(
+        {u"s" + std::u16string(size % 7 + 1, u'x') + AsciiToUtf16(std::to_string(size)),
+         test::RandomBytes(size, static_cast<unsigned>(size))});
   }
   const auto file = WriteCompoundFile(streams);
   EXPECT_EQ(file.size() % kSectorSize, 0u);
@@ -79,8 +74,8 @@ TEST(CompoundFile, NamesMatchWithAsciiCaseFoldedAndNothingElse) {
 
 TEST(CompoundFile, AFatLongerThanTheHeaderListsReadsThroughDifatSectors) {
   // 110 FAT sectors cover about 7 MB; 8 MB needs a DIFAT sector beyond the header's 109.
-  const std::vector<NamedStream> streams = {{u"big", RandomBytes(8u << 20, 1)},
-                                            {u"small", RandomBytes(100, 2)}};
+  const std::vector<NamedStream> streams = {{u"big", test::RandomBytes(8u << 20, 1)},
+                                            {u"small", test::RandomBytes(100, 2)}};
   const auto file = WriteCompoundFile(streams);
   EXPECT_GE(LoadU32Le(file.data() + header::kFatSectorCount), 110u);
   EXPECT_EQ(LoadU32Le(file.data() + header::kDifatSectorCount), 1u);
@@ -130,13 +125,16 @@ struct TreeCheck {
     if (id == kNoEntry) return 1;
     ++count;
     const std::u16string name = Name(id);
-    if ((low && CompareEntryNames(*low, name) >= 0) || (high && CompareEntryNames(name, *high) >= 0)) {
+    if ((low && CompareEntryNames(*low, name) >= 0) ||
+        (high && CompareEntryNames(name, *high) >= 0)) {
       return -1;
     }
     const bool red = Entry(id)[entry::kColor] == static_cast<unsigned char>(EntryColor::kRed);
     if (red && parentRed) return -1;
-    const int left = BlackHeight(LoadU32Le(Entry(id) + entry::kLeftSibling), low, &name, red, count);
-    const int right = BlackHeight(LoadU32Le(Entry(id) + entry::kRightSibling), &name, high, red, count);
+    const int left =
+        BlackHeight(LoadU32Le(Entry(id) + entry::kLeftSibling), low, &name, red, count);
+    const int right =
+        BlackHeight(LoadU32Le(Entry(id) + entry::kRightSibling), &name, high, red, count);
     if (left < 0 || left != right) return -1;
     return left + (red ? 0 : 1);
   }
@@ -154,7 +152,8 @@ TEST(CompoundFile, SiblingTreeIsAValidRedBlackSearchTreeForAnyCount) {
                          {}});
     }
     const auto file = WriteCompoundFile(streams);
-    const TreeCheck check{file, (LoadU32Le(file.data() + header::kFirstDirectorySector) + 1) * kSectorSize};
+    const TreeCheck check{
+        file, (LoadU32Le(file.data() + header::kFirstDirectorySector) + 1) * kSectorSize};
     const std::uint32_t top = LoadU32Le(check.Entry(0) + entry::kChild);
     EXPECT_EQ(check.Entry(top)[entry::kColor], static_cast<unsigned char>(EntryColor::kBlack));
     std::size_t reached = 0;
