@@ -32,8 +32,14 @@ if [ ! -f "$WINEPREFIX/.kestrune-ready" ]; then
 fi
 
 # One server for the whole run: Windows programs started side by side (ctest -j2) would
-# otherwise race to start it, and one of them can lose its connection.
-wineserver -p 2>/dev/null || true
+# otherwise race to start it, and one of them can lose its connection. Its background services
+# start with the first program; start them here, away from the test's output, or they would hold
+# a test's output pipe open for as long as the server lives.
+wine_start_server() {
+  wineserver -p 2>/dev/null || true
+  wine cmd.exe /c exit </dev/null >/dev/null 2>&1 || true
+}
+wine_start_server
 
 # Maps a folder to a drive letter that Windows programs see as removable media.
 wine_map_removable_drive() {
@@ -43,7 +49,7 @@ wine_map_removable_drive() {
   # The drive type is read when the wine server starts.
   wineserver -k 2>/dev/null || true
   wineserver -w
-  wineserver -p 2>/dev/null || true
+  wine_start_server
 }
 
 # Stops what this file started: the wine server and, if it started one, the X server.
@@ -58,5 +64,5 @@ wine_unmap_drive() {
   wine reg delete 'HKLM\Software\Wine\Drives' /v "$letter:" /f >/dev/null 2>&1 || true
   wineserver -k 2>/dev/null || true
   wineserver -w
-  wineserver -p 2>/dev/null || true
+  wine_start_server
 }
