@@ -1,0 +1,16 @@
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include "platform/console.h"
+
+namespace kestrune::platform {
+
+bool StandardOutputIsTerminal() { return ::isatty(STDOUT_FILENO) == 1; }
+
+int TerminalColumns() {
+  winsize size{};
+  if (::ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) == 0 && size.ws_col > 0) return size.ws_col;
+  return 80;
+}
+
+}  // namespace kestrune::platform
