@@ -151,13 +151,14 @@ class KeyFileKey : public SettingsKey {
     Lines lines = ReadLines(file_).value_or(Lines{});
     std::size_t header = FindGroup(lines, group_);
     if (header == lines.size()) lines.push_back("[" + group_ + "]");
-    const std::string line = utf8Name + "=" + Escape(EncodeUtf8(stored));
+    const std::string value = "=" + Escape(EncodeUtf8(stored));
     if (const std::optional<std::size_t> entry = FindEntry(lines, header, utf8Name)) {
-      lines[*entry] = line;
+      // As in the registry, the name keeps the letter case it was first stored with.
+      lines[*entry] = lines[*entry].substr(0, lines[*entry].find('=')) + value;
     } else {
       std::size_t end = SectionEnd(lines, header);
       while (end > header + 1 && lines[end - 1].empty()) --end;
-      lines.insert(lines.begin() + static_cast<std::ptrdiff_t>(end), line);
+      lines.insert(lines.begin() + static_cast<std::ptrdiff_t>(end), utf8Name + value);
     }
     return WriteAtomically(file_, lines);
   }
