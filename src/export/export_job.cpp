@@ -95,8 +95,8 @@ void ExportTracks(const std::vector<Track>& tracks, const std::u16string& output
   display.ShowFinish();
 }
 
-ExportReport RunExport(const TrackLibrary* library, ExportContext& context) {
-  ExportReport report;
+void RunExport(const TrackLibrary* library, ExportContext& context, ExportReport& report) {
+  report = ExportReport{};
   context.stop.Clear();
   try {
     ExportDisplay& display = context.display;
@@ -105,21 +105,16 @@ ExportReport RunExport(const TrackLibrary* library, ExportContext& context) {
     const std::u16string outputFolder = display.OutputFolderText();
     if (!ValidateExport(library != nullptr, tracks.size(), outputFolder, display)) {
       display.EnableForm(true);
-      return report;
+      return;
     }
     ExportTracks(tracks, outputFolder, library->playlists(), context, report);
   } catch (const std::exception&) {
     // Nothing may escape the worker thread.
   }
-  return report;
 }
 
-std::thread StartExport(const TrackLibrary* library, ExportContext context,
-                        std::function<void(ExportReport)> finished) {
-  return std::thread([library, context, finished = std::move(finished)]() mutable {
-    ExportReport report = RunExport(library, context);
-    if (finished) finished(std::move(report));
-  });
+std::thread StartExport(const TrackLibrary* library, ExportContext context, ExportReport& report) {
+  return std::thread([library, context, &report]() mutable { RunExport(library, context, report); });
 }
 
 }  // namespace kestrune

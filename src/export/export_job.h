@@ -2,7 +2,6 @@
 
 #include <atomic>
 #include <cstdint>
-#include <functional>
 #include <string>
 #include <string_view>
 #include <thread>
@@ -84,12 +83,12 @@ void ExportTracks(const std::vector<Track>& tracks, const std::u16string& output
 
 // The whole job on the calling thread: a new job starts with the stop request cleared; the
 // form is disabled, the ticked tracks and the folder are read and checked, then exported.
-// `library` is the loaded device, or null when none is loaded.
-ExportReport RunExport(const TrackLibrary* library, ExportContext& context);
+// `library` is the loaded device, or null when none is loaded. `report` is filled as the job
+// goes, so that the media library's side can look up what was copied while it works.
+void RunExport(const TrackLibrary* library, ExportContext& context, ExportReport& report);
 
-// RunExport on a thread of its own, the report handed to `finished` on that thread. The window
-// detaches the thread; the command line joins it.
-std::thread StartExport(const TrackLibrary* library, ExportContext context,
-                        std::function<void(ExportReport)> finished = {});
+// RunExport on a thread of its own. The window detaches the thread; the command line joins it.
+// The library and the report must outlive the thread.
+std::thread StartExport(const TrackLibrary* library, ExportContext context, ExportReport& report);
 
 }  // namespace kestrune

@@ -62,7 +62,11 @@ class ExportJobTest : public ::testing::Test {
     display_.organized = false;
   }
 
-  ExportReport Run(bool withDevice = true) { return RunExport(withDevice ? &*library_ : nullptr, context_); }
+  ExportReport Run(bool withDevice = true) {
+    ExportReport report;
+    RunExport(withDevice ? &*library_ : nullptr, context_, report);
+    return report;
+  }
 
   std::vector<std::string> Progress() const { return display_.CallsStartingWith("progress "); }
 
@@ -121,7 +125,7 @@ TEST_F(ExportJobTest, ChecksTheDeviceFirstThenTheTicksThenTheFolder) {
 TEST_F(ExportJobTest, TenTracksCountUpThenFinishWithAFullBarOnTheWorkerThread) {
   MakeDevice(10);
   ExportReport report;
-  StartExport(&*library_, context_, [&](ExportReport done) { report = std::move(done); }).join();
+  StartExport(&*library_, context_, report).join();
 
   std::vector<std::string> expected = CopyingLines(10, kTenths);
   expected.push_back("progress Successfully exported 10 of 10......|365|");

@@ -87,7 +87,7 @@ TEST_F(FolderLibraryTest, WritesM3u8WithRelativePathsAndExtendsItNextTime) {
 }
 
 TEST_F(FolderLibraryTest, ListsPlaylistFilesOfAnyExtensionCaseAndNumbersNewNamesThatClash) {
-  std::ofstream(out_ / "Playlists" / "rock.M3U8") << "#EXTM3U\n../x.mp3";  // no line end at the end
+  std::ofstream(out_ / "Playlists" / "rock.M3U8", std::ios::binary) << "#EXTM3U\n../x.mp3";  // no line end at the end
   std::ofstream(out_ / "Playlists" / "notes.txt") << "not a playlist";
   EXPECT_THAT(Names(), ElementsAre(u"rock"));
   // "Rock" would be rock.m3u8 on a file system that ignores case: the new one is numbered.
