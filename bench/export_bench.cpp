@@ -87,15 +87,13 @@ void BM_ExportJob(benchmark::State& state) {
   std::vector<Track> tracks;
   for (const auto& [id, track] : work.library->tracks()) tracks.push_back(track);
   auto files = platform::MakeSystemFiles();
-  auto shell = platform::MakeSystemShell();
-  auto settings = platform::MakeSystemSettingsStore();
   platform::FolderLibrary unused(out / "Playlists");
   for (auto _ : state) {
     state.PauseTiming();
     Reset(out);
     QuietDisplay display(tracks, TextFromPath(out), state.range(0) == 1);
     StopRequest stop;
-    ExportContext context{display, *files, stop, {unused, *shell, *settings, *files, platform::SystemClock()}};
+    ExportContext context{display, *files, stop, {unused, platform::SystemClock()}};
     ExportReport report;
     state.ResumeTiming();
     const auto start = std::chrono::steady_clock::now();

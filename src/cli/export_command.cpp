@@ -108,10 +108,8 @@ int RunExportCommand(const Options& options, const platform::Drives& drives, Exp
   ExportReport report;
   platform::FolderLibrary playlists(PathFromText(outputFolder + kPathSeparator + u"Playlists"),
                                     library ? DescribeCopies(*library, report) : platform::MediaInfoLookup{});
-  ExportContext context{display,
-                        environment.files,
-                        environment.stop,
-                        {playlists, environment.shell, environment.settings, environment.files, platform::SystemClock()}};
+  // The folder library is the whole library here: no desktop program is started.
+  ExportContext context{display, environment.files, environment.stop, {playlists, platform::SystemClock()}};
   StartExport(library ? &*library : nullptr, context, report).join();
 
   if (!library) {

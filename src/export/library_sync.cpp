@@ -84,7 +84,7 @@ void SyncToItunes(CopiedFiles& copiedFiles, const std::vector<Playlist>& playlis
                   const LibrarySyncContext& context) {
   try {
     ShowSyncProgress(display, kSyncingTitle, 1, copiedFiles.size());
-    LaunchItunes(context);
+    if (context.launcher != nullptr) LaunchItunes(*context.launcher);
     platform::CreatedApplication created = context.automation.CreateApplication(kLibraryProgramId);
     if (created.result != 0 || !created.application) {
       display.ShowMessage(kLibraryMissingText, kLibraryMissingTitle);
@@ -110,16 +110,16 @@ std::unique_ptr<platform::MediaUserPlaylist> FindOrCreateUserPlaylist(platform::
   return created->AsUserPlaylist();
 }
 
-void LaunchItunes(const LibrarySyncContext& context) {
+void LaunchItunes(const LibraryLauncher& launcher) {
   const std::optional<std::u16string> programFiles =
-      context.shell.SpecialFolderPath(platform::SpecialFolder::kProgramFiles);
+      launcher.shell.SpecialFolderPath(platform::SpecialFolder::kProgramFiles);
   if (!programFiles) return;
   std::u16string candidate = *programFiles + std::u16string(kLibraryExecutable);
-  if (!context.files.FileExists(PathFromText(candidate))) {
-    candidate = ReadRegistryString(context.settings, platform::RegistryRoot::kLocalMachine, kLibraryAppPathsKey,
+  if (!launcher.files.FileExists(PathFromText(candidate))) {
+    candidate = ReadRegistryString(launcher.settings, platform::RegistryRoot::kLocalMachine, kLibraryAppPathsKey,
                                    u"", candidate);
   }
-  if (context.files.FileExists(PathFromText(candidate))) context.shell.Run(u"\"" + candidate + u"\"");
+  if (launcher.files.FileExists(PathFromText(candidate))) launcher.shell.Run(u"\"" + candidate + u"\"");
 }
 
 }  // namespace kestrune

@@ -38,12 +38,18 @@ inline constexpr std::u16string_view kLibraryAppPathsKey =
 inline constexpr std::chrono::seconds kOperationTimeLimit{60};
 inline constexpr std::chrono::milliseconds kOperationPoll{10};
 
-struct LibrarySyncContext {
-  platform::MediaLibraryAutomation& automation;
+// What finding and starting the desktop library's program needs.
+struct LibraryLauncher {
   platform::Shell& shell;
   platform::SettingsStore& settings;
   platform::Files& files;
+};
+
+struct LibrarySyncContext {
+  platform::MediaLibraryAutomation& automation;
   platform::Clock& clock;
+  // The desktop library's program is started first when given; a folder library needs none.
+  const LibraryLauncher* launcher = nullptr;
 };
 
 // Adds every copied file to the desktop library, taking the location the library reports for
@@ -59,6 +65,6 @@ std::unique_ptr<platform::MediaUserPlaylist> FindOrCreateUserPlaylist(platform::
 
 // Starts the library's program when its executable is found below Program Files or through its
 // App Paths entry; does not wait for it.
-void LaunchItunes(const LibrarySyncContext& context);
+void LaunchItunes(const LibraryLauncher& launcher);
 
 }  // namespace kestrune

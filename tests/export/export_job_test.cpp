@@ -8,7 +8,6 @@
 #include "export/recording_display.h"
 #include "platform/fake/fake_media_library.h"
 #include "platform/fake/fake_shell.h"
-#include "platform/fake/memory_settings_store.h"
 #include "platform/system.h"
 #include "support/devices.h"
 #include "support/temp_folder.h"
@@ -92,10 +91,8 @@ class ExportJobTest : public ::testing::Test {
   CountingFiles files_;
   StopRequest stop_;
   platform::FakeMediaLibrary media_;
-  platform::FakeShell shell_;
-  platform::MemorySettingsStore settings_;
   platform::FakeClock clock_;
-  ExportContext context_{display_, files_, stop_, {media_, shell_, settings_, files_, clock_}};
+  ExportContext context_{display_, files_, stop_, {media_, clock_}};
 };
 
 TEST_F(ExportJobTest, ChecksTheDeviceFirstThenTheTicksThenTheFolder) {

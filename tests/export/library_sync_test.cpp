@@ -42,7 +42,8 @@ class LibrarySyncTest : public ::testing::Test {
   platform::MemorySettingsStore settings_;
   std::unique_ptr<platform::Files> files_ = platform::MakeSystemFiles();
   platform::FakeClock clock_;
-  LibrarySyncContext context_{media_, shell_, settings_, *files_, clock_};
+  LibraryLauncher launcher_{shell_, settings_, *files_};
+  LibrarySyncContext context_{media_, clock_, &launcher_};
 };
 
 TEST_F(LibrarySyncTest, AddsEveryCopyThenFillsPlaylistsWithWhereTheLibraryKeepsThem) {
@@ -130,21 +131,30 @@ class LaunchTest : public LibrarySyncTest {
 TEST_F(LaunchTest, StartsTheExecutableBelowProgramFilesQuoted) {
   const std::u16string exe = programFiles_ + u"\\iTunes\\iTunes.exe";
   test::WriteBytes(PathFromText(exe), {1});
-  LaunchItunes(context_);
+  LaunchItunes(launcher_);
   EXPECT_THAT(shell_.runs, ElementsAre(u"\"" + exe + u"\""));
+}
+
+TEST_F(LaunchTest, TheSyncStartsTheProgramOnlyWhenGivenALauncher) {
+  test::WriteBytes(PathFromText(programFiles_ + u"\\iTunes\\iTunes.exe"), {1});
+  Sync();
+  EXPECT_EQ(shell_.runs.size(), 1u);
+  context_.launcher = nullptr;
+  Sync();
+  EXPECT_EQ(shell_.runs.size(), 1u);
 }
 
 TEST_F(LaunchTest, FallsBackToTheAppPathsEntryAndRunsNothingThatIsNotThere) {
   const std::u16string elsewhere = TextFromPath(folder_ / "elsewhere.exe");
   settings_.SetValue(platform::RegistryRoot::kLocalMachine, kLibraryAppPathsKey, u"",
                      {platform::kRegSz, platform::StringValueBytes(elsewhere)});
-  LaunchItunes(context_);
+  LaunchItunes(launcher_);
   EXPECT_THAT(shell_.runs, IsEmpty());
   test::WriteBytes(PathFromText(elsewhere), {1});
-  LaunchItunes(context_);
+  LaunchItunes(launcher_);
   EXPECT_THAT(shell_.runs, ElementsAre(u"\"" + elsewhere + u"\""));
   shell_.folders.clear();
-  LaunchItunes(context_);
+  LaunchItunes(launcher_);
   EXPECT_EQ(shell_.runs.size(), 1u);
 }
 
