@@ -9,14 +9,6 @@ namespace {
 
 bool IsHighSurrogate(char16_t unit) { return unit >= 0xD800 && unit <= 0xDBFF; }
 
-bool IsSeparator(char16_t unit) {
-#ifdef _WIN32
-  return unit == u'\\' || unit == u'/';
-#else
-  return unit == u'/';
-#endif
-}
-
 }  // namespace
 
 void TrimSpaces(std::u16string& text) {
@@ -59,7 +51,7 @@ std::u16string AlbumFolderName(const Track& track) {
 
 std::u16string ExtensionOf(std::u16string_view path) {
   std::size_t componentStart = path.size();
-  while (componentStart > 0 && !IsSeparator(path[componentStart - 1])) --componentStart;
+  while (componentStart > 0 && !IsPathSeparator(path[componentStart - 1])) --componentStart;
   const std::size_t dot = path.rfind(u'.');
   if (dot == std::u16string_view::npos || dot < componentStart) return {};
   return std::u16string(path.substr(dot));
