@@ -27,18 +27,22 @@ show_picker() {
 
 show_picker "Cancel me"
 xdotool key Escape
-wait "$picker"
+timeout 20 tail --pid="$picker" -f /dev/null || { kill "$picker"; echo "the picker did not close"; exit 1; }
 [ "$(cat "$work/Cancel me.out")" = "chosen:" ] || { echo "cancelling gave: $(cat "$work/Cancel me.out")"; exit 1; }
 
 mkdir "$work/Chosen Folder"
 show_picker "Choose me"
-xdotool type --delay 20 "$work/Chosen Folder/"
-sleep 0.5
+# A slash opens the location field; no further key may come before it is there.
+xdotool type "/"
+sleep 1
+xdotool type --delay 40 "${work#/}/Chosen Folder/"
+sleep 1
 xdotool key Return
 sleep 0.5
 # Still open when the first Enter only opened the folder: a second one selects it.
+sleep 1
 kill -0 "$picker" 2>/dev/null && xdotool key Return
-wait "$picker"
+timeout 20 tail --pid="$picker" -f /dev/null || { kill "$picker"; echo "the picker did not close"; exit 1; }
 [ "$(cat "$work/Choose me.out")" = "chosen:$work/Chosen Folder" ] ||
   { echo "choosing gave: $(cat "$work/Choose me.out")"; cat "$work/Choose me.err"; exit 1; }
 echo "the GTK picker gave nothing when cancelled and the typed folder when chosen"

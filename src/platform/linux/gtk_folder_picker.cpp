@@ -20,6 +20,9 @@ class GtkFolderPicker : public FolderPicker {
     // Only folders of the file system, and the user may make a new one, as the Windows picker allows.
     gtk_file_chooser_set_local_only(chooser, TRUE);
     gtk_file_chooser_set_create_folders(chooser, TRUE);
+    // It opens on the desktop, as the Windows picker does, rather than on recent files.
+    const gchar* desktop = g_get_user_special_dir(G_USER_DIRECTORY_DESKTOP);
+    gtk_file_chooser_set_current_folder(chooser, desktop != nullptr ? desktop : g_get_home_dir());
     std::u16string chosen;
     if (gtk_dialog_run(GTK_DIALOG(dialog)) == GTK_RESPONSE_ACCEPT) {
       if (gchar* name = gtk_file_chooser_get_filename(chooser)) {
