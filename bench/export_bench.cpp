@@ -37,7 +37,9 @@ class QuietDisplay : public ExportDisplay {
   void EnableForm(bool) override {}
   std::vector<Track> CollectTickedTracks() override { return tracks_; }
   std::u16string OutputFolderText() override { return folder_; }
-  bool IsTicked(ExportOption option) override { return option == ExportOption::kOrganized && organized_; }
+  bool IsTicked(ExportOption option) override {
+    return option == ExportOption::kOrganized && organized_;
+  }
   void ShowMessage(std::u16string_view, std::u16string_view) override {}
   void ShowProgressPanel() override {}
   void ShowProgress(const ProgressView&) override {}
@@ -50,14 +52,18 @@ class QuietDisplay : public ExportDisplay {
 };
 
 struct Work {
-  Work() : folder(fs::temp_directory_path() / ("kestrune-export-bench-" + std::to_string(std::chrono::steady_clock::now().time_since_epoch().count()))) {
+  Work()
+      : folder(fs::temp_directory_path() /
+               ("kestrune-export-bench-" +
+                std::to_string(std::chrono::steady_clock::now().time_since_epoch().count()))) {
     mkipod::GeneratedDeviceOptions options;
     options.tracks = kFiles;
     options.playlists = 0;
     options.mediaSize = kFileSize;
     mkipod::DeviceDescription device = mkipod::GeneratedDevice(options);
     // Every file is 1 MB: a title heard twice would count as an earlier copy and not be copied.
-    for (mkipod::TrackDescription& track : device.tracks) track.title = track.title.value_or(u"") + u" " + FormatDecimal(track.id);
+    for (mkipod::TrackDescription& track : device.tracks)
+      track.title = track.title.value_or(u"") + u" " + FormatDecimal(track.id);
     mkipod::WriteDevice(device, folder / "device");
     library.emplace(TextFromPath(folder / "device"));
     if (!library->LoadDatabase()) std::abort();
@@ -98,11 +104,13 @@ void BM_ExportJob(benchmark::State& state) {
     state.ResumeTiming();
     const auto start = std::chrono::steady_clock::now();
     RunExport(&*work.library, context, report);
-    const double seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+    const double seconds =
+        std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
     state.SetIterationTime(seconds);
     (state.range(0) == 1 ? organizedSeconds : flatSeconds).push_back(seconds);
-    const auto copied = std::count_if(report.results.begin(), report.results.end(),
-                                      [](const TrackResult& result) { return result.outcome == CopyOutcome::kCopied; });
+    const auto copied = std::count_if(
+        report.results.begin(), report.results.end(),
+        [](const TrackResult& result) { return result.outcome == CopyOutcome::kCopied; });
     if (copied != kFiles) state.SkipWithError("not every file was copied");
   }
   state.SetBytesProcessed(static_cast<std::int64_t>(state.iterations()) * kFiles * kFileSize);
@@ -111,7 +119,8 @@ void BM_ExportJob(benchmark::State& state) {
 void BM_CpRecursive(benchmark::State& state) {
   Work& work = TheWork();
   const fs::path out = work.folder / "out";
-  const std::string command = "cp -r '" + (work.folder / "device" / "iPod_Control" / "Music").string() + "' '" +
+  const std::string command = "cp -r '" +
+                              (work.folder / "device" / "iPod_Control" / "Music").string() + "' '" +
                               out.string() + "'";
   for (auto _ : state) {
     state.PauseTiming();
@@ -119,7 +128,8 @@ void BM_CpRecursive(benchmark::State& state) {
     state.ResumeTiming();
     const auto start = std::chrono::steady_clock::now();
     if (std::system(command.c_str()) != 0) state.SkipWithError("cp failed");
-    const double seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+    const double seconds =
+        std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
     state.SetIterationTime(seconds);
     copySeconds.push_back(seconds);
   }
@@ -127,8 +137,18 @@ void BM_CpRecursive(benchmark::State& state) {
 }
 
 // The shared machine's disk is noisy: many single runs, compared by their medians.
-BENCHMARK(BM_CpRecursive)->Iterations(1)->Repetitions(9)->UseManualTime()->Unit(benchmark::kMillisecond);
-BENCHMARK(BM_ExportJob)->ArgName("organized")->Arg(0)->Arg(1)->Iterations(1)->Repetitions(9)->UseManualTime()
+BENCHMARK(BM_CpRecursive)
+    ->Iterations(1)
+    ->Repetitions(9)
+    ->UseManualTime()
+    ->Unit(benchmark::kMillisecond);
+BENCHMARK(BM_ExportJob)
+    ->ArgName("organized")
+    ->Arg(0)
+    ->Arg(1)
+    ->Iterations(1)
+    ->Repetitions(9)
+    ->UseManualTime()
     ->Unit(benchmark::kMillisecond);
 
 double Median(std::vector<double> values) {
@@ -150,10 +170,13 @@ int main(int argc, char** argv) {
   if (!flatSeconds.empty() && !organizedSeconds.empty() && !copySeconds.empty()) {
     const double megabytes = kFiles * (kFileSize / 1048576.0);
     const double copyRate = megabytes / Median(copySeconds);
-    const double flatRate = megabytes / Median(flatSeconds), organizedRate = megabytes / Median(organizedSeconds);
-    std::printf("median throughput: cp -r %.0f MB/s; export flat %.0f MB/s, ratio %.2f (target at least 0.90); "
-                "export organized %.0f MB/s, ratio %.2f\n",
-                copyRate, flatRate, flatRate / copyRate, organizedRate, organizedRate / copyRate);
+    const double flatRate = megabytes / Median(flatSeconds),
+                 organizedRate = megabytes / Median(organizedSeconds);
+    std::printf(
+        "median throughput: cp -r %.0f MB/s; export flat %.0f MB/s, ratio %.2f (target at least "
+        "0.90); "
+        "export organized %.0f MB/s, ratio %.2f\n",
+        copyRate, flatRate, flatRate / copyRate, organizedRate, organizedRate / copyRate);
   }
   return 0;
 }

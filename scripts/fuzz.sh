@@ -7,6 +7,7 @@ top=$(cd "$(dirname "$0")/.." && pwd)
 seconds=${1:-60}
 build="$top/build/linux-fuzz"
 export KESTRUNE_MKIPOD="$build/tools/mkipod/mkipod"
+export KESTRUNE_UIPACK="$build/tools/uipack/uipack"
 
 run_one() {
   local fuzzer=$1 seconds=$2 top=$3

@@ -22,6 +22,7 @@ stage "Windows x86_64 tests under Wine"
 cmake --preset win64 >/dev/null
 cmake --build --preset win64
 source scripts/wine-env.sh
+trap wine_env_stop EXIT
 ctest --preset win64
 for scenario in tests/wine/*.sh; do
   stage "Wine scenario $(basename "$scenario" .sh)"

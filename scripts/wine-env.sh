@@ -10,6 +10,7 @@ if [ -z "${KESTRUNE_XVFB_STARTED:-}" ]; then
   display=:97
   if ! xdpyinfo -display "$display" >/dev/null 2>&1; then
     Xvfb "$display" -screen 0 1280x1024x24 -nolisten tcp >/dev/null 2>&1 &
+    export KESTRUNE_XVFB_PID=$!
     for _ in $(seq 50); do xdpyinfo -display "$display" >/dev/null 2>&1 && break; sleep 0.1; done
   fi
   export DISPLAY=$display KESTRUNE_XVFB_STARTED=1
@@ -30,6 +31,10 @@ if [ ! -f "$WINEPREFIX/.kestrune-ready" ]; then
   touch "$WINEPREFIX/.kestrune-ready"
 fi
 
+# One server for the whole run: Windows programs started side by side (ctest -j2) would
+# otherwise race to start it, and one of them can lose its connection.
+wineserver -p 2>/dev/null || true
+
 # Maps a folder to a drive letter that Windows programs see as removable media.
 wine_map_removable_drive() {
   local letter=$1 folder=$2
@@ -38,6 +43,13 @@ wine_map_removable_drive() {
   # The drive type is read when the wine server starts.
   wineserver -k 2>/dev/null || true
   wineserver -w
+  wineserver -p 2>/dev/null || true
+}
+
+# Stops what this file started: the wine server and, if it started one, the X server.
+wine_env_stop() {
+  wineserver -k 2>/dev/null || true
+  if [ -n "${KESTRUNE_XVFB_PID:-}" ]; then kill "$KESTRUNE_XVFB_PID" 2>/dev/null || true; fi
 }
 
 wine_unmap_drive() {
@@ -46,4 +58,5 @@ wine_unmap_drive() {
   wine reg delete 'HKLM\Software\Wine\Drives' /v "$letter:" /f >/dev/null 2>&1 || true
   wineserver -k 2>/dev/null || true
   wineserver -w
+  wineserver -p 2>/dev/null || true
 }

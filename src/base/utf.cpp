@@ -1,5 +1,8 @@
 #include "base/utf.h"
 
+#include <bit>
+#include <cstring>
+
 namespace kestrune {
 namespace {
 
@@ -100,8 +103,12 @@ std::u16string DecodeUtf8(std::string_view bytes) {
 
 std::u16string DecodeUtf16Le(const unsigned char* bytes, std::size_t byteCount) {
   std::u16string out(byteCount / 2, u'\0');
-  for (std::size_t i = 0; i < out.size(); ++i) {
-    out[i] = static_cast<char16_t>(bytes[2 * i] | (bytes[2 * i + 1] << 8));
+  if constexpr (std::endian::native == std::endian::little) {
+    std::memcpy(out.data(), bytes, out.size() * 2);
+  } else {
+    for (std::size_t i = 0; i < out.size(); ++i) {
+      out[i] = static_cast<char16_t>(bytes[2 * i] | (bytes[2 * i + 1] << 8));
+    }
   }
   return out;
 }

@@ -47,19 +47,22 @@ std::vector<const Track*> ChosenTracks(const TrackLibrary& library, std::int32_t
   if (playlist < 0) {
     for (const auto& [id, track] : library.tracks()) chosen.push_back(&track);
   } else {
-    for (const auto& [id, sameId] : library.playlists()[static_cast<std::size_t>(playlist)].trackIds) {
+    for (const auto& [id, sameId] :
+         library.playlists()[static_cast<std::size_t>(playlist)].trackIds) {
       chosen.push_back(&library.tracks().at(id));
     }
   }
   return chosen;
 }
 
-void PrintJson(const TrackLibrary& library, const std::vector<const Track*>& tracks, std::ostream& out) {
+void PrintJson(const TrackLibrary& library, const std::vector<const Track*>& tracks,
+               std::ostream& out) {
   out << "{\"device\": " << JsonString(library.deviceName()) << ", \"tracks\": [";
   const char* separator = "\n";
   for (const Track* track : tracks) {
     out << separator << "{\"id\": " << track->trackId << ", \"title\": " << JsonString(track->title)
-        << ", \"artist\": " << JsonString(track->artist) << ", \"album\": " << JsonString(track->album)
+        << ", \"artist\": " << JsonString(track->artist)
+        << ", \"album\": " << JsonString(track->album)
         << ", \"genre\": " << JsonString(track->genre) << ", \"length_ms\": " << track->lengthMs
         << ", \"length\": " << JsonString(track->lengthText) << ", \"size\": " << track->fileSize
         << ", \"path\": " << JsonString(track->devicePath) << "}";
@@ -80,9 +83,15 @@ void PrintJson(const TrackLibrary& library, const std::vector<const Track*>& tra
   out << "\n]}\n";
 }
 
-void PrintTable(const TrackLibrary& library, const std::vector<const Track*>& tracks, std::ostream& out) {
-  TextTable table({{u"ID", true}, {u"TITLE"}, {u"ARTIST"}, {u"ALBUM"}, {u"GENRE", false, 16},
-                   {u"TIME", true}, {u"SIZE", true}});
+void PrintTable(const TrackLibrary& library, const std::vector<const Track*>& tracks,
+                std::ostream& out) {
+  TextTable table({{u"ID", true},
+                   {u"TITLE"},
+                   {u"ARTIST"},
+                   {u"ALBUM"},
+                   {u"GENRE", false, 16},
+                   {u"TIME", true},
+                   {u"SIZE", true}});
   for (const Track* track : tracks) {
     table.AddRow({FormatDecimal(track->trackId), track->title, track->artist, track->album,
                   track->genre, track->lengthText, FormatDecimal(track->fileSize)});
@@ -91,8 +100,8 @@ void PrintTable(const TrackLibrary& library, const std::vector<const Track*>& tr
   out << '\n';
   for (std::size_t i = 0; i < library.playlists().size(); ++i) {
     const Playlist& playlist = library.playlists()[i];
-    out << "playlist " << i << ": " << JsonString(playlist.name) << ", "
-        << playlist.trackIds.size() << " tracks\n";
+    out << "playlist " << i << ": " << JsonString(playlist.name) << ", " << playlist.trackIds.size()
+        << " tracks\n";
   }
   out << Summary(library) << '\n';
 }

@@ -17,7 +17,8 @@ namespace {
 
 // The chosen tracks in the order the window would list them: ascending id for the whole device,
 // a playlist or a search, the given order for ids. Empty with `error` set on a mistake.
-std::vector<Track> ChooseTracks(const Options& options, const TrackLibrary& library, std::string& error) {
+std::vector<Track> ChooseTracks(const Options& options, const TrackLibrary& library,
+                                std::string& error) {
   std::vector<Track> chosen;
   const auto& tracks = library.tracks();
   if (options.search) return SearchTracks(tracks, *options.search);
@@ -28,7 +29,8 @@ std::vector<Track> ChooseTracks(const Options& options, const TrackLibrary& libr
               " playlists, numbered from 0; there is no playlist " + std::to_string(index);
       return {};
     }
-    for (const auto& [id, sameId] : library.playlists()[index].trackIds) chosen.push_back(tracks.at(id));
+    for (const auto& [id, sameId] : library.playlists()[index].trackIds)
+      chosen.push_back(tracks.at(id));
     return chosen;
   }
   if (!options.ids.empty()) {
@@ -39,7 +41,8 @@ std::vector<Track> ChooseTracks(const Options& options, const TrackLibrary& libr
         return {};
       }
       // Each track once, as a table never lists one twice.
-      const bool seen = std::any_of(chosen.begin(), chosen.end(), [id](const Track& t) { return t.trackId == id; });
+      const bool seen = std::any_of(chosen.begin(), chosen.end(),
+                                    [id](const Track& t) { return t.trackId == id; });
       if (!seen) chosen.push_back(found->second);
     }
     return chosen;
@@ -60,7 +63,8 @@ platform::MediaInfoLookup DescribeCopies(const TrackLibrary& library, const Expo
   };
 }
 
-int PrintSummary(const ExportReport& report, const std::u16string& outputFolder, bool playlists, std::ostream& out) {
+int PrintSummary(const ExportReport& report, const std::u16string& outputFolder, bool playlists,
+                 std::ostream& out) {
   std::size_t copied = 0, present = 0, failed = 0;
   for (const TrackResult& result : report.results) {
     if (result.outcome == CopyOutcome::kCopied) ++copied;
@@ -71,21 +75,23 @@ int PrintSummary(const ExportReport& report, const std::u16string& outputFolder,
   out << "copied " << copied << ", already present " << present << ", failed " << failed << '\n';
   for (const TrackResult& result : report.results) {
     if (result.outcome == CopyOutcome::kFailed) {
-      out << "failed: " << result.trackId << ' ' << JsonString(result.title) << ": " << result.reason << '\n';
+      out << "failed: " << result.trackId << ' ' << JsonString(result.title) << ": "
+          << result.reason << '\n';
     }
   }
   if (report.results.size() < report.total) {
     out << "stopped after " << report.results.size() << " of " << report.total << " tracks\n";
   }
-  if (playlists) out << "playlists in " << EncodeUtf8(outputFolder + kPathSeparator + u"Playlists") << '\n';
+  if (playlists)
+    out << "playlists in " << EncodeUtf8(outputFolder + kPathSeparator + u"Playlists") << '\n';
   const bool complete = failed == 0 && report.results.size() == report.total;
   return complete ? kExitOk : kExitIncomplete;
 }
 
 }  // namespace
 
-int RunExportCommand(const Options& options, const platform::Drives& drives, ExportEnvironment& environment,
-                     std::ostream& out, std::ostream& err) {
+int RunExportCommand(const Options& options, const platform::Drives& drives,
+                     ExportEnvironment& environment, std::ostream& out, std::ostream& err) {
   std::string failure;
   const std::optional<TrackLibrary> library = FindDevice(drives, &failure);
   TerminalDisplay::Choices choices;
@@ -100,16 +106,19 @@ int RunExportCommand(const Options& options, const platform::Drives& drives, Exp
   choices.outputFolder = options.out ? *options.out
                                      : ReadSetting(environment.settings, kOutputPathValue,
                                                    DefaultOutputFolder(environment.shell));
-  choices.organized = options.organized.value_or(ReadSetting(environment.settings, kOrganizedValue, u"true") == u"true");
+  choices.organized = options.organized.value_or(
+      ReadSetting(environment.settings, kOrganizedValue, u"true") == u"true");
   choices.rebuildPlaylists = options.playlistsM3u;
   const std::u16string outputFolder = choices.outputFolder;
 
   TerminalDisplay display(std::move(choices), environment.terminal, environment.columns, out, err);
   ExportReport report;
-  platform::FolderLibrary playlists(PathFromText(outputFolder + kPathSeparator + u"Playlists"),
-                                    library ? DescribeCopies(*library, report) : platform::MediaInfoLookup{});
+  platform::FolderLibrary playlists(
+      PathFromText(outputFolder + kPathSeparator + u"Playlists"),
+      library ? DescribeCopies(*library, report) : platform::MediaInfoLookup{});
   // The folder library is the whole library here: no desktop program is started.
-  ExportContext context{display, environment.files, environment.stop, {playlists, platform::SystemClock()}};
+  ExportContext context{
+      display, environment.files, environment.stop, {playlists, platform::SystemClock()}};
   StartExport(library ? &*library : nullptr, context, report).join();
 
   if (!library) {

@@ -28,7 +28,7 @@ struct ExportEnvironment {
 // Exports the chosen tracks of the device the search finds with the window's export job, then
 // prints what was copied, already present and failed (with why). 0 when every chosen track was
 // copied or already present.
-int RunExportCommand(const Options& options, const platform::Drives& drives, ExportEnvironment& environment,
-                     std::ostream& out, std::ostream& err);
+int RunExportCommand(const Options& options, const platform::Drives& drives,
+                     ExportEnvironment& environment, std::ostream& out, std::ostream& err);
 
 }  // namespace kestrune::cli

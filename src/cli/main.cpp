@@ -32,8 +32,12 @@ int RunExport(const kestrune::cli::Options& options, const kestrune::platform::D
   const auto settings = platform::MakeSystemSettingsStore();
   const auto shell = platform::MakeSystemShell();
   const auto files = platform::MakeSystemFiles();
-  cli::ExportEnvironment environment{*settings, *shell, *files, stopRequest,
-                                     platform::StandardOutputIsTerminal(), platform::TerminalColumns()};
+  cli::ExportEnvironment environment{*settings,
+                                     *shell,
+                                     *files,
+                                     stopRequest,
+                                     platform::StandardOutputIsTerminal(),
+                                     platform::TerminalColumns()};
   std::signal(SIGINT, OnInterrupt);
   return cli::RunExportCommand(options, drives, environment, std::cout, std::cerr);
 }
@@ -60,12 +64,14 @@ int Run(const std::vector<std::u16string>& arguments) {
       const bool list = options->command == cli::Command::kList;
       if (!options->device) {
         const auto drives = platform::MakeSystemDrives();
-        return list ? cli::RunList(*options, *drives, std::cout, std::cerr) : RunExport(*options, *drives);
+        return list ? cli::RunList(*options, *drives, std::cout, std::cerr)
+                    : RunExport(*options, *drives);
       }
       // A device folder named on the command line is the only place looked at.
       platform::FolderDrives folder;
       folder.AddFolder(PathFromText(*options->device));
-      return list ? cli::RunList(*options, folder, std::cout, std::cerr) : RunExport(*options, folder);
+      return list ? cli::RunList(*options, folder, std::cout, std::cerr)
+                  : RunExport(*options, folder);
     }
   }
   return cli::kExitUsage;

@@ -10,7 +10,8 @@ namespace kestrune::cli {
 const char* const kUsage =
     "usage: kestrune-cli devices\n"
     "       kestrune-cli list [--device DIR] [--playlist INDEX] [--json]\n"
-    "       kestrune-cli export [--device DIR] [--out DIR] [--organized | --flat] [--playlists-m3u]\n"
+    "       kestrune-cli export [--device DIR] [--out DIR] [--organized | --flat] "
+    "[--playlists-m3u]\n"
     "                           (--all | --playlist INDEX | --search TEXT | --ids ID,ID...)\n";
 
 namespace {
@@ -21,7 +22,8 @@ std::optional<std::vector<std::uint32_t>> ParseIds(std::u16string_view list) {
   std::size_t start = 0;
   for (;;) {
     const std::size_t comma = list.find(u',', start);
-    const auto id = ParseDecimalU32(list.substr(start, comma == std::u16string_view::npos ? comma : comma - start));
+    const auto id = ParseDecimalU32(
+        list.substr(start, comma == std::u16string_view::npos ? comma : comma - start));
     if (!id) return std::nullopt;
     ids.push_back(*id);
     if (comma == std::u16string_view::npos) return ids;
@@ -31,8 +33,8 @@ std::optional<std::vector<std::uint32_t>> ParseIds(std::u16string_view list) {
 
 // Takes the export option at `i` (and its value); false when it is none of them. A mistake
 // leaves its explanation in `error`.
-bool ParseExportArgument(const std::vector<std::u16string>& arguments, std::size_t& i, Options& options,
-                         std::string& error) {
+bool ParseExportArgument(const std::vector<std::u16string>& arguments, std::size_t& i,
+                         Options& options, std::string& error) {
   const std::u16string& argument = arguments[i];
   const bool hasValue = i + 1 < arguments.size();
   if (argument == u"--organized" || argument == u"--flat") {
@@ -48,8 +50,10 @@ bool ParseExportArgument(const std::vector<std::u16string>& arguments, std::size
     if (options.search->empty()) error = "--search takes a text that is not empty";
   } else if (argument == u"--ids" && hasValue) {
     auto ids = ParseIds(arguments[++i]);
-    if (!ids) error = "--ids takes track ids separated by commas, like 52,53";
-    else options.ids = std::move(*ids);
+    if (!ids)
+      error = "--ids takes track ids separated by commas, like 52,53";
+    else
+      options.ids = std::move(*ids);
   } else {
     return false;
   }
@@ -58,7 +62,8 @@ bool ParseExportArgument(const std::vector<std::u16string>& arguments, std::size
 
 }  // namespace
 
-std::optional<Options> ParseOptions(const std::vector<std::u16string>& arguments, std::string& error) {
+std::optional<Options> ParseOptions(const std::vector<std::u16string>& arguments,
+                                    std::string& error) {
   Options options;
   if (arguments.empty()) return options;
   const std::u16string& command = arguments.front();
@@ -98,10 +103,11 @@ std::optional<Options> ParseOptions(const std::vector<std::u16string>& arguments
     }
   }
   if (options.command == Command::kExport) {
-    const int choices = (options.all ? 1 : 0) + (options.playlist ? 1 : 0) + (options.search ? 1 : 0) +
-                        (options.ids.empty() ? 0 : 1);
+    const int choices = (options.all ? 1 : 0) + (options.playlist ? 1 : 0) +
+                        (options.search ? 1 : 0) + (options.ids.empty() ? 0 : 1);
     if (choices != 1) {
-      error = "export takes exactly one of --all, --playlist INDEX, --search TEXT and --ids ID,ID...";
+      error =
+          "export takes exactly one of --all, --playlist INDEX, --search TEXT and --ids ID,ID...";
       return std::nullopt;
     }
   }

@@ -19,7 +19,8 @@ std::u16string OneLine(std::u16string_view text) {
 
 }  // namespace
 
-TerminalDisplay::TerminalDisplay(Choices choices, bool terminal, int columns, std::ostream& out, std::ostream& err)
+TerminalDisplay::TerminalDisplay(Choices choices, bool terminal, int columns, std::ostream& out,
+                                 std::ostream& err)
     : choices_(std::move(choices)),
       terminal_(terminal),
       columns_(columns > 1 ? static_cast<std::size_t>(columns) : 80),
@@ -33,7 +34,8 @@ bool TerminalDisplay::IsTicked(ExportOption option) {
 void TerminalDisplay::ShowMessage(std::u16string_view text, std::u16string_view title) {
   if (lineOpen_) out_ << '\n' << std::flush;
   lineOpen_ = false;
-  err_ << "kestrune-cli: " << EncodeUtf8(OneLine(title)) << ": " << EncodeUtf8(OneLine(text)) << '\n';
+  err_ << "kestrune-cli: " << EncodeUtf8(OneLine(title)) << ": " << EncodeUtf8(OneLine(text))
+       << '\n';
 }
 
 void TerminalDisplay::ShowProgress(const ProgressView& progress) {
@@ -44,7 +46,8 @@ void TerminalDisplay::ShowProgress(const ProgressView& progress) {
     return;
   }
   const std::size_t filled = progress.total == 0 ? 0 : kBarWidth * progress.done / progress.total;
-  std::u16string bar = u"[" + std::u16string(filled, u'#') + std::u16string(kBarWidth - filled, u' ') + u"] ";
+  std::u16string bar =
+      u"[" + std::u16string(filled, u'#') + std::u16string(kBarWidth - filled, u' ') + u"] ";
   line = bar + line;
   // One terminal line, redrawn in place: cut to the width, then blank out what the last one left.
   const std::size_t width = columns_ - 1;

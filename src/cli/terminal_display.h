@@ -20,7 +20,8 @@ class TerminalDisplay : public ExportDisplay {
     bool rebuildPlaylists = false;
   };
 
-  TerminalDisplay(Choices choices, bool terminal, int columns, std::ostream& out, std::ostream& err);
+  TerminalDisplay(Choices choices, bool terminal, int columns, std::ostream& out,
+                  std::ostream& err);
 
   void EnableForm(bool) override {}
   std::vector<Track> CollectTickedTracks() override { return choices_.tracks; }

@@ -9,9 +9,8 @@ namespace {
 
 // Characters as a terminal counts them, roughly: a surrogate pair is one.
 std::size_t DisplayWidth(const std::u16string& text) {
-  return static_cast<std::size_t>(std::count_if(text.begin(), text.end(), [](char16_t unit) {
-    return unit < 0xDC00 || unit > 0xDFFF;
-  }));
+  return static_cast<std::size_t>(std::count_if(
+      text.begin(), text.end(), [](char16_t unit) { return unit < 0xDC00 || unit > 0xDFFF; }));
 }
 
 std::u16string Fit(const std::u16string& text, std::size_t width) {

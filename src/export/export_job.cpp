@@ -9,14 +9,15 @@
 namespace kestrune {
 namespace {
 
-void ShowProgress(ExportDisplay& display, std::u16string_view title, std::uint32_t done, std::uint32_t total,
-                  std::u16string_view item) {
+void ShowProgress(ExportDisplay& display, std::u16string_view title, std::uint32_t done,
+                  std::uint32_t total, std::u16string_view item) {
   display.ShowProgress(MakeProgress(title, done, total, item));
 }
 
 }  // namespace
 
-bool ValidateExport(bool libraryLoaded, std::size_t count, std::u16string_view outputFolder, ExportDisplay& display) {
+bool ValidateExport(bool libraryLoaded, std::size_t count, std::u16string_view outputFolder,
+                    ExportDisplay& display) {
   if (!libraryLoaded) {
     display.ShowMessage(kNoDeviceText, kNoDeviceTitle);
     return false;
@@ -32,18 +33,20 @@ bool ValidateExport(bool libraryLoaded, std::size_t count, std::u16string_view o
   return true;
 }
 
-TrackResult CopyOneTrack(const Track& track, const std::u16string& outputFolder, ExportContext& context,
-                         CopiedFiles& copiedFiles) {
+TrackResult CopyOneTrack(const Track& track, const std::u16string& outputFolder,
+                         ExportContext& context, CopiedFiles& copiedFiles) {
   TrackResult result{track.trackId, track.title, {}, CopyOutcome::kFailed, {}};
   try {
     const std::u16string extension = ExtensionOf(track.devicePath);
     bool present = false;
     const bool organized = context.display.IsTicked(ExportOption::kOrganized);
-    result.target = TargetPathFor(track, extension, outputFolder, organized, context.files, present);
+    result.target =
+        TargetPathFor(track, extension, outputFolder, organized, context.files, present);
     const std::filesystem::path target = PathFromText(result.target);
     if (present) {
       result.outcome = CopyOutcome::kAlreadyPresent;
-    } else if (const std::optional<std::filesystem::path> source = LocateTrackFile(track); !source) {
+    } else if (const std::optional<std::filesystem::path> source = LocateTrackFile(track);
+               !source) {
       result.reason = "the file is missing on the device";
     } else if (const std::error_code error = context.files.CopyFileReplacing(*source, target)) {
       result.reason = error.message();
@@ -61,8 +64,8 @@ TrackResult CopyOneTrack(const Track& track, const std::u16string& outputFolder,
   return result;
 }
 
-std::uint32_t CopyAll(const std::vector<Track>& tracks, const std::u16string& outputFolder, ExportContext& context,
-                      ExportReport& report) {
+std::uint32_t CopyAll(const std::vector<Track>& tracks, const std::u16string& outputFolder,
+                      ExportContext& context, ExportReport& report) {
   const auto total = static_cast<std::uint32_t>(tracks.size());
   std::uint32_t done = 0;
   for (const Track& track : tracks) {
@@ -76,7 +79,8 @@ std::uint32_t CopyAll(const std::vector<Track>& tracks, const std::u16string& ou
 }
 
 void ExportTracks(const std::vector<Track>& tracks, const std::u16string& outputFolder,
-                  const std::vector<Playlist>& playlists, ExportContext& context, ExportReport& report) {
+                  const std::vector<Playlist>& playlists, ExportContext& context,
+                  ExportReport& report) {
   ExportDisplay& display = context.display;
   display.EnableForm(false);
   display.ShowProgressPanel();
@@ -114,7 +118,8 @@ void RunExport(const TrackLibrary* library, ExportContext& context, ExportReport
 }
 
 std::thread StartExport(const TrackLibrary* library, ExportContext context, ExportReport& report) {
-  return std::thread([library, context, &report]() mutable { RunExport(library, context, report); });
+  return std::thread(
+      [library, context, &report]() mutable { RunExport(library, context, report); });
 }
 
 }  // namespace kestrune

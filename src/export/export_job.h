@@ -19,9 +19,11 @@ inline constexpr std::u16string_view kExportedTitle = u"Successfully exported ";
 inline constexpr std::u16string_view kFinishedTitle = u"Finished ";
 inline constexpr std::u16string_view kDoneItem = u"Done!";
 
-inline constexpr std::u16string_view kNoDeviceText = u"Make sure you have connected your iPod to your computer!";
+inline constexpr std::u16string_view kNoDeviceText =
+    u"Make sure you have connected your iPod to your computer!";
 inline constexpr std::u16string_view kNoDeviceTitle = u"No iPod Device Found";
-inline constexpr std::u16string_view kNothingTickedText = u"No music/video has been selected to export!";
+inline constexpr std::u16string_view kNothingTickedText =
+    u"No music/video has been selected to export!";
 inline constexpr std::u16string_view kNothingTickedTitle = u"No iPod song selected";
 inline constexpr std::u16string_view kNoFolderText = u"Please specify the output folder!";
 inline constexpr std::u16string_view kNoFolderTitle = u"No output folder";
@@ -65,21 +67,23 @@ struct ExportContext {
 };
 
 // The three checks, in order, each with its message; false at the first that fails.
-bool ValidateExport(bool libraryLoaded, std::size_t count, std::u16string_view outputFolder, ExportDisplay& display);
+bool ValidateExport(bool libraryLoaded, std::size_t count, std::u16string_view outputFolder,
+                    ExportDisplay& display);
 
 // Copies one track to its target unless an earlier copy is there, and records the copy.
-TrackResult CopyOneTrack(const Track& track, const std::u16string& outputFolder, ExportContext& context,
-                         CopiedFiles& copiedFiles);
+TrackResult CopyOneTrack(const Track& track, const std::u16string& outputFolder,
+                         ExportContext& context, CopiedFiles& copiedFiles);
 
 // Copies the tracks in order with progress before each, stopping between two files on request.
 // Gives how many tracks were handled, the stopped one included.
-std::uint32_t CopyAll(const std::vector<Track>& tracks, const std::u16string& outputFolder, ExportContext& context,
-                      ExportReport& report);
+std::uint32_t CopyAll(const std::vector<Track>& tracks, const std::u16string& outputFolder,
+                      ExportContext& context, ExportReport& report);
 
 // Shows the panel, copies, hands the copies to the media library when asked to, and ends in the
 // Finished state, whatever was thrown on the way.
 void ExportTracks(const std::vector<Track>& tracks, const std::u16string& outputFolder,
-                  const std::vector<Playlist>& playlists, ExportContext& context, ExportReport& report);
+                  const std::vector<Playlist>& playlists, ExportContext& context,
+                  ExportReport& report);
 
 // The whole job on the calling thread: a new job starts with the stop request cleared; the
 // form is disabled, the ticked tracks and the folder are read and checked, then exported.

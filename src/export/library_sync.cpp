@@ -9,8 +9,10 @@
 namespace kestrune {
 namespace {
 
-void ShowSyncProgress(ExportDisplay& display, std::u16string_view title, std::size_t step, std::size_t total) {
-  display.ShowProgress(MakeProgress(title, static_cast<std::uint32_t>(step), static_cast<std::uint32_t>(total), kPleaseWait));
+void ShowSyncProgress(ExportDisplay& display, std::u16string_view title, std::size_t step,
+                      std::size_t total) {
+  display.ShowProgress(MakeProgress(title, static_cast<std::uint32_t>(step),
+                                    static_cast<std::uint32_t>(total), kPleaseWait));
 }
 
 // Done (false), or empty when the answer cannot be read, is neither true nor false, or the
@@ -37,8 +39,8 @@ std::optional<std::u16string> AddedLocation(platform::MediaOperationStatus& stat
   return location;
 }
 
-void AddToLibrary(platform::MediaApplication& application, CopiedFiles& copiedFiles, ExportDisplay& display,
-                  platform::Clock& clock) {
+void AddToLibrary(platform::MediaApplication& application, CopiedFiles& copiedFiles,
+                  ExportDisplay& display, platform::Clock& clock) {
   const std::unique_ptr<platform::MediaLibraryPlaylist> library = application.LibraryPlaylist();
   if (!library) return;
   std::size_t step = 0;
@@ -46,7 +48,8 @@ void AddToLibrary(platform::MediaApplication& application, CopiedFiles& copiedFi
     ShowSyncProgress(display, kAddingTitle, ++step, copiedFiles.size());
     const std::unique_ptr<platform::MediaOperationStatus> status = library->AddFile(path);
     if (!status || !WaitForOperation(*status, clock)) continue;
-    if (std::optional<std::u16string> location = AddedLocation(*status)) path = std::move(*location);
+    if (std::optional<std::u16string> location = AddedLocation(*status))
+      path = std::move(*location);
   }
 }
 
@@ -55,7 +58,8 @@ void RebuildPlaylists(platform::MediaApplication& application, const CopiedFiles
   std::size_t step = 0;
   for (const Playlist& playlist : playlists) {
     ShowSyncProgress(display, kRebuildingTitle, ++step, playlists.size());
-    const std::unique_ptr<platform::MediaUserPlaylist> target = FindOrCreateUserPlaylist(&application, playlist.name);
+    const std::unique_ptr<platform::MediaUserPlaylist> target =
+        FindOrCreateUserPlaylist(&application, playlist.name);
     if (!target) continue;
     for (const auto& [trackId, sameId] : playlist.trackIds) {
       const auto copied = copiedFiles.find(trackId);
@@ -64,8 +68,8 @@ void RebuildPlaylists(platform::MediaApplication& application, const CopiedFiles
   }
 }
 
-std::unique_ptr<platform::MediaUserPlaylist> MatchingUserPlaylist(platform::MediaPlaylistCollection& playlists,
-                                                                  std::u16string_view name) {
+std::unique_ptr<platform::MediaUserPlaylist> MatchingUserPlaylist(
+    platform::MediaPlaylistCollection& playlists, std::u16string_view name) {
   const std::int32_t count = playlists.Count().value_or(0);
   for (std::int32_t index = 1; index <= count; ++index) {
     const std::unique_ptr<platform::MediaPlaylist> item = playlists.Item(index);
@@ -80,8 +84,8 @@ std::unique_ptr<platform::MediaUserPlaylist> MatchingUserPlaylist(platform::Medi
 
 }  // namespace
 
-void SyncToItunes(CopiedFiles& copiedFiles, const std::vector<Playlist>& playlists, ExportDisplay& display,
-                  const LibrarySyncContext& context) {
+void SyncToItunes(CopiedFiles& copiedFiles, const std::vector<Playlist>& playlists,
+                  ExportDisplay& display, const LibrarySyncContext& context) {
   try {
     ShowSyncProgress(display, kSyncingTitle, 1, copiedFiles.size());
     if (context.launcher != nullptr) LaunchItunes(*context.launcher);
@@ -97,13 +101,14 @@ void SyncToItunes(CopiedFiles& copiedFiles, const std::vector<Playlist>& playlis
   }
 }
 
-std::unique_ptr<platform::MediaUserPlaylist> FindOrCreateUserPlaylist(platform::MediaApplication* application,
-                                                                      std::u16string_view name) {
+std::unique_ptr<platform::MediaUserPlaylist> FindOrCreateUserPlaylist(
+    platform::MediaApplication* application, std::u16string_view name) {
   if (application == nullptr) return nullptr;
   const std::unique_ptr<platform::MediaSource> source = application->LibrarySource();
   if (!source) return nullptr;
   if (const std::unique_ptr<platform::MediaPlaylistCollection> playlists = source->Playlists()) {
-    if (std::unique_ptr<platform::MediaUserPlaylist> found = MatchingUserPlaylist(*playlists, name)) return found;
+    if (std::unique_ptr<platform::MediaUserPlaylist> found = MatchingUserPlaylist(*playlists, name))
+      return found;
   }
   const std::unique_ptr<platform::MediaPlaylist> created = application->CreatePlaylist(name);
   if (!created) return nullptr;
@@ -116,10 +121,11 @@ void LaunchItunes(const LibraryLauncher& launcher) {
   if (!programFiles) return;
   std::u16string candidate = *programFiles + std::u16string(kLibraryExecutable);
   if (!launcher.files.FileExists(PathFromText(candidate))) {
-    candidate = ReadRegistryString(launcher.settings, platform::RegistryRoot::kLocalMachine, kLibraryAppPathsKey,
-                                   u"", candidate);
+    candidate = ReadRegistryString(launcher.settings, platform::RegistryRoot::kLocalMachine,
+                                   kLibraryAppPathsKey, u"", candidate);
   }
-  if (launcher.files.FileExists(PathFromText(candidate))) launcher.shell.Run(u"\"" + candidate + u"\"");
+  if (launcher.files.FileExists(PathFromText(candidate)))
+    launcher.shell.Run(u"\"" + candidate + u"\"");
 }
 
 }  // namespace kestrune

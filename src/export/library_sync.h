@@ -27,7 +27,8 @@ inline constexpr std::u16string_view kRebuildingTitle = u"Rebuilding playlist ";
 inline constexpr std::u16string_view kPleaseWait = u"Please wait......";
 inline constexpr std::u16string_view kLibraryProgramId = u"iTunes.Application";
 inline constexpr std::u16string_view kLibraryMissingText =
-    u"Failed to sync music/video/playlist back to iTunes.\r\nPlease make sure you have iTunes installed on your computer!";
+    u"Failed to sync music/video/playlist back to iTunes.\r\nPlease make sure you have iTunes "
+    u"installed on your computer!";
 inline constexpr std::u16string_view kLibraryMissingTitle = u"iTunes not found!";
 inline constexpr std::u16string_view kLibraryExecutable = u"\\iTunes\\iTunes.exe";
 inline constexpr std::u16string_view kLibraryAppPathsKey =
@@ -55,13 +56,13 @@ struct LibrarySyncContext {
 // Adds every copied file to the desktop library, taking the location the library reports for
 // it, then extends (or creates) one user playlist per device playlist with its copied tracks.
 // Nothing is ever removed from the library. Exceptions end the stage and are dropped.
-void SyncToItunes(CopiedFiles& copiedFiles, const std::vector<Playlist>& playlists, ExportDisplay& display,
-                  const LibrarySyncContext& context);
+void SyncToItunes(CopiedFiles& copiedFiles, const std::vector<Playlist>& playlists,
+                  ExportDisplay& display, const LibrarySyncContext& context);
 
 // The first user playlist that is not smart and whose name equals `name` in any ASCII letter
 // case, else a new playlist of that name; empty when neither can be had.
-std::unique_ptr<platform::MediaUserPlaylist> FindOrCreateUserPlaylist(platform::MediaApplication* application,
-                                                                      std::u16string_view name);
+std::unique_ptr<platform::MediaUserPlaylist> FindOrCreateUserPlaylist(
+    platform::MediaApplication* application, std::u16string_view name);
 
 // Starts the library's program when its executable is found below Program Files or through its
 // App Paths entry; does not wait for it.

@@ -58,12 +58,13 @@ std::u16string ExtensionOf(std::u16string_view path) {
 }
 
 std::u16string TargetPathFor(const Track& track, std::u16string_view extension,
-                             std::u16string_view outputFolder, bool organized, platform::Files& files,
-                             bool& alreadyPresent) {
+                             std::u16string_view outputFolder, bool organized,
+                             platform::Files& files, bool& alreadyPresent) {
   const std::u16string base = BaseNameFor(track.title, extension);
   // The separator is added whatever the folder ends with; a doubled one means the same folder.
   std::u16string folder = std::u16string(outputFolder) + kPathSeparator;
-  if (organized) folder += ArtistFolderName(track) + kPathSeparator + AlbumFolderName(track) + kPathSeparator;
+  if (organized)
+    folder += ArtistFolderName(track) + kPathSeparator + AlbumFolderName(track) + kPathSeparator;
   files.CreateFolderPath(PathFromText(folder));
 
   std::u16string target = folder + base + std::u16string(extension);

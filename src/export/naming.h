@@ -42,7 +42,7 @@ std::u16string ExtensionOf(std::u16string_view path);
 // while the name is taken by anything other than a file of the track's exact size. Such a file
 // counts as an earlier copy: `alreadyPresent` is then set. Creates the target's folder.
 std::u16string TargetPathFor(const Track& track, std::u16string_view extension,
-                             std::u16string_view outputFolder, bool organized, platform::Files& files,
-                             bool& alreadyPresent);
+                             std::u16string_view outputFolder, bool organized,
+                             platform::Files& files, bool& alreadyPresent);
 
 }  // namespace kestrune

@@ -8,7 +8,9 @@
 namespace kestrune {
 namespace {
 
-bool IsAsciiLetter(char16_t unit) { return (unit >= u'A' && unit <= u'Z') || (unit >= u'a' && unit <= u'z'); }
+bool IsAsciiLetter(char16_t unit) {
+  return (unit >= u'A' && unit <= u'Z') || (unit >= u'a' && unit <= u'z');
+}
 
 std::u16string BoolText(bool value) { return value ? u"true" : u"false"; }
 
@@ -42,13 +44,17 @@ std::u16string ReadRegistryString(platform::SettingsStore& store, platform::Regi
   }
 }
 
-std::u16string ReadSetting(platform::SettingsStore& store, std::u16string_view name, std::u16string_view defaultText) {
-  return ReadRegistryString(store, platform::RegistryRoot::kCurrentUser, kSettingsKey, name, defaultText);
+std::u16string ReadSetting(platform::SettingsStore& store, std::u16string_view name,
+                           std::u16string_view defaultText) {
+  return ReadRegistryString(store, platform::RegistryRoot::kCurrentUser, kSettingsKey, name,
+                            defaultText);
 }
 
-void WriteSetting(platform::SettingsStore& store, std::u16string_view name, std::u16string_view text) {
+void WriteSetting(platform::SettingsStore& store, std::u16string_view name,
+                  std::u16string_view text) {
   try {
-    if (const auto key = store.CreateKey(platform::RegistryRoot::kCurrentUser, kSettingsKey)) key->SetString(name, text);
+    if (const auto key = store.CreateKey(platform::RegistryRoot::kCurrentUser, kSettingsKey))
+      key->SetString(name, text);
   } catch (const std::exception&) {
     // Settings that cannot be stored are not worth interrupting anyone for.
   }
@@ -76,10 +82,11 @@ std::u16string DefaultOutputFolder(const platform::Shell& shell) {
   if (program.size() >= 2 && program[1] == u':' && IsAsciiLetter(program[0])) {
     fallback = std::u16string(1, AsciiUpper(program[0])) + u":\\VizUveVuzod";
   } else {
-    fallback = shell.SpecialFolderPath(platform::SpecialFolder::kProfile).value_or(u"") + kPathSeparator +
-               u"VizUveVuzod";
+    fallback = shell.SpecialFolderPath(platform::SpecialFolder::kProfile).value_or(u"") +
+               kPathSeparator + u"VizUveVuzod";
   }
-  const std::optional<std::u16string> music = shell.SpecialFolderPath(platform::SpecialFolder::kMusic);
+  const std::optional<std::u16string> music =
+      shell.SpecialFolderPath(platform::SpecialFolder::kMusic);
   if (!music) return fallback;
   return *music + kPathSeparator + u"iTunes" + kPathSeparator + u"iTunes Music";
 }

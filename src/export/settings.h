@@ -25,10 +25,12 @@ std::u16string ReadRegistryString(platform::SettingsStore& store, platform::Regi
                                   std::u16string_view defaultText);
 
 // The same for a value of the program's own key.
-std::u16string ReadSetting(platform::SettingsStore& store, std::u16string_view name, std::u16string_view defaultText);
+std::u16string ReadSetting(platform::SettingsStore& store, std::u16string_view name,
+                           std::u16string_view defaultText);
 
 // Stores the text under the program's key, creating it; a failure is silent.
-void WriteSetting(platform::SettingsStore& store, std::u16string_view name, std::u16string_view text);
+void WriteSetting(platform::SettingsStore& store, std::u16string_view name,
+                  std::u16string_view text);
 
 // The four persisted export options.
 struct ExportOptions {

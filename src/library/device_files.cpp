@@ -54,7 +54,8 @@ bool StaysInsideDrive(std::u16string_view path, std::size_t rootLength) {
   return true;
 }
 
-std::optional<std::filesystem::path> FindBelowDrive(std::u16string_view path, std::size_t rootLength) {
+std::optional<std::filesystem::path> FindBelowDrive(std::u16string_view path,
+                                                    std::size_t rootLength) {
   if (!StaysInsideDrive(path, rootLength)) return std::nullopt;
   std::error_code error;
   std::filesystem::path exact = PathFromText(path);

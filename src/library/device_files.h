@@ -18,7 +18,8 @@ bool StaysInsideDrive(std::u16string_view path, std::size_t rootLength);
 // `rootLength` units. When the path does not exist exactly, each component below the drive is
 // matched without regard to ASCII letter case, as devices formatted elsewhere may be mounted
 // case-sensitively. Empty when nothing matches or the path would leave the drive.
-std::optional<std::filesystem::path> FindBelowDrive(std::u16string_view path, std::size_t rootLength);
+std::optional<std::filesystem::path> FindBelowDrive(std::u16string_view path,
+                                                    std::size_t rootLength);
 
 // The track's file on the device, or empty when it counts as missing.
 std::optional<std::filesystem::path> LocateTrackFile(const Track& track);

@@ -15,6 +15,7 @@ void ListRemovableDrives(const platform::Drives& drives, std::vector<std::u16str
 
 // The library of the first candidate drive whose database loads. A malformed database, or any
 // other failure while searching, ends the search with nothing found; `failure` then says why.
-std::optional<TrackLibrary> FindDevice(const platform::Drives& drives, std::string* failure = nullptr);
+std::optional<TrackLibrary> FindDevice(const platform::Drives& drives,
+                                       std::string* failure = nullptr);
 
 }  // namespace kestrune

@@ -1,5 +1,6 @@
 #include "library/track_library.h"
 
+#include <algorithm>
 #include <cstdio>
 
 #include "base/paths.h"
@@ -39,6 +40,19 @@ const DbChunk& FirstChild(const DbChunk& set, const char* what) {
   return set.children.front();
 }
 
+// What ReadMhodText gives for each type from 1 to 14, in one pass over the children: the
+// first record of each type counts.
+void ReadTrackStrings(const DbChunk& node, std::array<std::u16string, 15>& texts) {
+  std::uint32_t found = 0;
+  for (const DbChunk& child : node.children) {
+    if (child.Tag() != itunesdb::kTagMhod) continue;
+    const std::uint32_t type = child.U32At(itunesdb::kMhodTypeOffset);
+    if (type == 0 || type > kLastStringType || (found & (1u << type)) != 0) continue;
+    found |= 1u << type;
+    texts[type] = DecodeString(child);
+  }
+}
+
 }  // namespace
 
 bool ReadMhodText(const DbChunk& node, std::uint32_t type, std::u16string& text) {
@@ -74,21 +88,20 @@ bool TrackLibrary::LoadDatabase() {
   if (!file) return false;
   FileHandle stream = OpenForReading(*file);
   if (!stream) return false;
-  // Records are small and read one after another; a large buffer saves most of the calls.
-  std::setvbuf(stream.get(), nullptr, _IOFBF, 1 << 18);
   return ReadDatabase(stream.get());
 }
 
 bool TrackLibrary::ReadDatabase(std::FILE* stream) {
-  itunesdb::FileChunkReader reader(stream);
   // An empty file is a placeholder some devices keep beside a database of another form.
-  const std::int32_t start = reader.Tell();
-  if (std::fgetc(stream) == EOF) return false;
-  reader.Seek(start, itunesdb::SeekOrigin::kBegin);
-  std::optional<itunesdb::RecordBytes> first = reader.ReadChunk();
-  if (!first) throw MalformedDatabase("the database ends inside its first record");
-  if (LoadU32Le(first->data()) != itunesdb::kTagMhbd) return false;
-  const DbChunk root = itunesdb::ParseChunk(std::move(*first), reader, itunesdb::ChunkContext::kNone);
+  const int first = std::fgetc(stream);
+  if (first == EOF || std::ungetc(first, stream) == EOF) return false;
+  // The tree lives only while the library is built, and goes with its arena.
+  itunesdb::RecordArena arena;
+  itunesdb::FileChunkReader reader(stream, arena);
+  std::optional<itunesdb::RecordBytes> head = reader.ReadChunk();
+  if (!head) throw MalformedDatabase("the database ends inside its first record");
+  if (LoadU32Le(head->data()) != itunesdb::kTagMhbd) return false;
+  const DbChunk root = itunesdb::ParseChunk(*head, reader, itunesdb::ChunkContext::kNone, arena);
 
   const DbChunk* trackSet = nullptr;
   const DbChunk* playlistSet = nullptr;
@@ -106,18 +119,22 @@ bool TrackLibrary::ReadDatabase(std::FILE* stream) {
 
 void TrackLibrary::LoadTracks(const DbChunk& trackList) {
   for (const DbChunk& record : trackList.children) {
-    Track track;
-    for (std::uint32_t type = 1; type <= kLastStringType; ++type) {
-      ReadMhodText(record, type, track.mhodText[type]);
-    }
-    track.trackId = record.U32At(itunesdb::kMhitTrackIdOffset);
+    // Filled in place: a later track with the same id replaces the earlier one.
+    const std::uint32_t id = record.U32At(itunesdb::kMhitTrackIdOffset);
+    auto [entry, added] = tracks_.try_emplace(id);
+    Track& track = entry->second;
+    if (!added) track = Track{};
+    track.trackId = id;
     track.fileSize = record.U32At(itunesdb::kMhitFileSizeOffset);
     track.lengthMs = record.U32At(itunesdb::kMhitLengthMsOffset);
+    ReadTrackStrings(record, track.mhodText);
 
     const std::u16string& location = track.mhodText[kLocationMhod];
     track.devicePath.reserve(rootPath_.size() + location.size());
     track.devicePath = rootPath_;
-    for (char16_t unit : location) track.devicePath += unit == u':' ? kPathSeparator : unit;
+    track.devicePath += location;
+    std::replace(track.devicePath.begin() + static_cast<std::ptrdiff_t>(rootPath_.size()),
+                 track.devicePath.end(), u':', kPathSeparator);
     track.rootLength = static_cast<std::uint32_t>(rootPath_.size());
 
     track.title = track.mhodText[kTitleMhod];
@@ -125,8 +142,6 @@ void TrackLibrary::LoadTracks(const DbChunk& trackList) {
     track.album = track.mhodText[kAlbumMhod];
     track.genre = track.mhodText[kGenreMhod];
     track.lengthText = FormatLength(track.lengthMs);
-    // A later track with the same id replaces the earlier one.
-    tracks_.insert_or_assign(track.trackId, std::move(track));
   }
 }
 

@@ -7,7 +7,9 @@ namespace {
 
 class RealClock : public Clock {
  public:
-  std::chrono::steady_clock::time_point Now() const override { return std::chrono::steady_clock::now(); }
+  std::chrono::steady_clock::time_point Now() const override {
+    return std::chrono::steady_clock::now();
+  }
   void Pause(std::chrono::milliseconds duration) override { std::this_thread::sleep_for(duration); }
 };
 

@@ -40,7 +40,8 @@ std::string LineText(std::u16string_view text) {
 std::vector<std::filesystem::path> ListPlaylistFiles(const std::filesystem::path& folder) {
   std::vector<std::filesystem::path> files;
   std::error_code error;
-  for (std::filesystem::directory_iterator it(folder, error), end; !error && it != end; it.increment(error)) {
+  for (std::filesystem::directory_iterator it(folder, error), end; !error && it != end;
+       it.increment(error)) {
     if (it->is_regular_file(error) && IsPlaylistFile(it->path())) files.push_back(it->path());
   }
   std::sort(files.begin(), files.end());
@@ -74,7 +75,9 @@ class DoneOperation : public MediaOperationStatus {
  public:
   explicit DoneOperation(std::u16string location) : location_(std::move(location)) {}
   std::optional<AutomationBool> InProgress() override { return kAutomationFalse; }
-  std::unique_ptr<MediaTrackCollection> Tracks() override { return std::make_unique<DoneTracks>(location_); }
+  std::unique_ptr<MediaTrackCollection> Tracks() override {
+    return std::make_unique<DoneTracks>(location_);
+  }
 
  private:
   std::u16string location_;
@@ -107,9 +110,11 @@ class FolderUserPlaylist : public MediaUserPlaylist {
     std::ifstream in(file_, std::ios::binary);
     if (!in) return std::nullopt;
     std::string line;
-    while (std::getline(in, line) && (line.empty() || line.front() == '#' || line.front() == '\xEF')) {
+    while (std::getline(in, line) &&
+           (line.empty() || line.front() == '#' || line.front() == '\xEF')) {
       if (!line.empty() && line.back() == '\r') line.pop_back();
-      if (line.compare(0, kNameTag.size(), kNameTag) == 0) return DecodeUtf8(line.substr(kNameTag.size()));
+      if (line.compare(0, kNameTag.size(), kNameTag) == 0)
+        return DecodeUtf8(line.substr(kNameTag.size()));
     }
     return TextFromPath(file_.stem());
   }
@@ -124,8 +129,10 @@ class FolderUserPlaylist : public MediaUserPlaylist {
  private:
   std::string Entry(std::u16string_view path) const {
     std::error_code error;
-    const std::filesystem::path target = std::filesystem::absolute(PathFromText(path), error).lexically_normal();
-    const std::filesystem::path base = std::filesystem::absolute(file_.parent_path(), error).lexically_normal();
+    const std::filesystem::path target =
+        std::filesystem::absolute(PathFromText(path), error).lexically_normal();
+    const std::filesystem::path base =
+        std::filesystem::absolute(file_.parent_path(), error).lexically_normal();
     std::filesystem::path written = target.lexically_relative(base);
     if (written.empty()) written = target;  // another drive: no relative path leads there
 
@@ -168,7 +175,8 @@ namespace {
 
 class FolderPlaylist : public MediaPlaylist {
  public:
-  FolderPlaylist(const FolderLibrary& library, std::filesystem::path file) : library_(library), file_(std::move(file)) {}
+  FolderPlaylist(const FolderLibrary& library, std::filesystem::path file)
+      : library_(library), file_(std::move(file)) {}
   std::optional<std::int32_t> Kind() override { return kPlaylistKindUser; }
   std::unique_ptr<MediaUserPlaylist> AsUserPlaylist() override {
     return std::make_unique<FolderUserPlaylist>(library_, file_);
@@ -207,19 +215,22 @@ class FolderSource : public MediaSource {
 
 // A file name of the folder that no playlist file has, in any letter case: the cleaned name,
 // else the cleaned name numbered [0], [1] ...
-std::filesystem::path FreePlaylistFile(const std::filesystem::path& folder, std::u16string_view name) {
+std::filesystem::path FreePlaylistFile(const std::filesystem::path& folder,
+                                       std::u16string_view name) {
   std::u16string base(name);
   ReplaceReservedCharacters(base);
   base = MakeNameAcceptable(std::move(base), u"Playlist");
   std::vector<std::u16string> taken;
   std::error_code error;
-  for (std::filesystem::directory_iterator it(folder, error), end; !error && it != end; it.increment(error)) {
+  for (std::filesystem::directory_iterator it(folder, error), end; !error && it != end;
+       it.increment(error)) {
     taken.push_back(TextFromPath(it->path().filename()));
   }
   std::u16string candidate = base + std::u16string(kExtension);
   for (std::uint32_t n = 0;; ++n) {
-    const bool used = std::any_of(taken.begin(), taken.end(),
-                                  [&](const std::u16string& t) { return EqualsIgnoringAsciiCase(t, candidate); });
+    const bool used = std::any_of(taken.begin(), taken.end(), [&](const std::u16string& t) {
+      return EqualsIgnoringAsciiCase(t, candidate);
+    });
     if (!used) return folder / PathFromText(candidate);
     candidate = base + u"[" + FormatDecimal(n) + u"]" + std::u16string(kExtension);
   }
@@ -235,7 +246,9 @@ class FolderApplication : public MediaApplication {
     return std::make_unique<FolderLibraryPlaylist>(library_.libraryFiles_);
   }
 
-  std::unique_ptr<MediaSource> LibrarySource() override { return std::make_unique<FolderSource>(library_); }
+  std::unique_ptr<MediaSource> LibrarySource() override {
+    return std::make_unique<FolderSource>(library_);
+  }
 
   std::unique_ptr<MediaPlaylist> CreatePlaylist(std::u16string_view name) override {
     const std::filesystem::path file = FreePlaylistFile(library_.folder_, name);

@@ -12,7 +12,8 @@
 namespace kestrune::platform {
 
 // The drives of this machine, with the given folders listed first as removable drives.
-std::unique_ptr<Drives> MakeSystemDrives(const std::vector<std::filesystem::path>& foldersFirst = {});
+std::unique_ptr<Drives> MakeSystemDrives(
+    const std::vector<std::filesystem::path>& foldersFirst = {});
 
 std::unique_ptr<Files> MakeSystemFiles();
 

@@ -4,7 +4,8 @@
 
 namespace kestrune {
 
-std::vector<Track> SearchTracks(const std::map<std::uint32_t, Track>& tracks, std::u16string_view text) {
+std::vector<Track> SearchTracks(const std::map<std::uint32_t, Track>& tracks,
+                                std::u16string_view text) {
   const std::u16string wanted = AsciiUpper(text);
   std::vector<Track> found;
   std::u16string hay;

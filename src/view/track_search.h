@@ -13,6 +13,7 @@ namespace kestrune {
 // artist, album and genre joined with nothing between them (so a match may span two fields),
 // also upper-cased in a to z only. Every track of the device, in ascending id. The window
 // ignores an empty text before it gets here.
-std::vector<Track> SearchTracks(const std::map<std::uint32_t, Track>& tracks, std::u16string_view text);
+std::vector<Track> SearchTracks(const std::map<std::uint32_t, Track>& tracks,
+                                std::u16string_view text);
 
 }  // namespace kestrune

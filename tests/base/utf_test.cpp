@@ -30,10 +30,10 @@ TEST(DecodeUtf8, ReturnsWhatEncodeUtf8Wrote) {
 }
 
 TEST(DecodeUtf8, ReplacesEachMalformedByte) {
-  EXPECT_EQ(DecodeUtf8("a\x80z"), u"a\uFFFDz");                 // stray continuation byte
-  EXPECT_EQ(DecodeUtf8("\xC3"), u"\uFFFD");                     // truncated at the end
-  EXPECT_EQ(DecodeUtf8("\xE2\x98z"), u"\uFFFD\uFFFDz");         // truncated in the middle
-  EXPECT_EQ(DecodeUtf8("\xC0\xAF"), u"\uFFFD\uFFFD");           // overlong
+  EXPECT_EQ(DecodeUtf8("a\x80z"), u"a\uFFFDz");                  // stray continuation byte
+  EXPECT_EQ(DecodeUtf8("\xC3"), u"\uFFFD");                      // truncated at the end
+  EXPECT_EQ(DecodeUtf8("\xE2\x98z"), u"\uFFFD\uFFFDz");          // truncated in the middle
+  EXPECT_EQ(DecodeUtf8("\xC0\xAF"), u"\uFFFD\uFFFD");            // overlong
   EXPECT_EQ(DecodeUtf8("\xE0\x80\xAF"), u"\uFFFD\uFFFD\uFFFD");  // overlong three-byte form
   EXPECT_EQ(DecodeUtf8("\xF4\x90\x80\x80"), u"\uFFFD\uFFFD\uFFFD\uFFFD");  // above U+10FFFF
   EXPECT_EQ(DecodeUtf8("\xFF"), u"\uFFFD");

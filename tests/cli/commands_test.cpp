@@ -30,7 +30,8 @@ class CommandsTest : public ::testing::Test {
     device.deviceName = u"Pod \"One\"";
     device.tracks = {test::SimpleTrack(53, u"Second"), test::SimpleTrack(52, u"First")};
     device.tracks[0].title = std::u16string{u'S', 0xDC01};
-    device.playlists = {test::SimplePlaylist(u"Mix", {53, 52}), test::SimplePlaylist(u"Solo", {53})};
+    device.playlists = {test::SimplePlaylist(u"Mix", {53, 52}),
+                        test::SimplePlaylist(u"Solo", {53})};
     mkipod::WriteDevice(device, folder_ / "device");
     drives_.AddFolder(folder_ / "device");
   }
@@ -47,9 +48,12 @@ TEST_F(CommandsTest, ListsJsonInAscendingIdWithPlaylistsInOrder) {
   options.json = true;
   ASSERT_EQ(Run(options), kExitOk);
   const std::string json = out_.str();
-  EXPECT_THAT(json, HasSubstr("{\"device\": \"Pod \\\"One\\\"\", \"tracks\": [\n{\"id\": 52, \"title\": \"First\", "
-                              "\"artist\": \"Artist\", \"album\": \"Album\", \"genre\": \"Genre\", "
-                              "\"length_ms\": 52000, \"length\": \"0:52\", \"size\": 152, \"path\": "));
+  EXPECT_THAT(
+      json,
+      HasSubstr(
+          "{\"device\": \"Pod \\\"One\\\"\", \"tracks\": [\n{\"id\": 52, \"title\": \"First\", "
+          "\"artist\": \"Artist\", \"album\": \"Album\", \"genre\": \"Genre\", "
+          "\"length_ms\": 52000, \"length\": \"0:52\", \"size\": 152, \"path\": "));
   EXPECT_LT(json.find("\"id\": 52"), json.find("\"id\": 53"));
   EXPECT_THAT(json, HasSubstr("\"title\": \"S\\udc01\""));
   EXPECT_THAT(json, HasSubstr("\"playlists\": [\n{\"name\": \"Mix\", \"track_ids\": [52, 53]},\n"

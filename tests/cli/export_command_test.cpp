@@ -24,14 +24,23 @@ using ::testing::HasSubstr;
 class InterruptingFiles : public platform::Files {
  public:
   InterruptingFiles(StopRequest& stop, int stopAtCopy) : stop_(stop), stopAtCopy_(stopAtCopy) {}
-  bool FileExists(const std::filesystem::path& path) const override { return real_->FileExists(path); }
-  std::uint64_t FileSizeOf(const std::filesystem::path& path) const override { return real_->FileSizeOf(path); }
-  bool CreateFolderPath(const std::filesystem::path& path) override { return real_->CreateFolderPath(path); }
-  std::error_code CopyFileReplacing(const std::filesystem::path& source, const std::filesystem::path& target) override {
+  bool FileExists(const std::filesystem::path& path) const override {
+    return real_->FileExists(path);
+  }
+  std::uint64_t FileSizeOf(const std::filesystem::path& path) const override {
+    return real_->FileSizeOf(path);
+  }
+  bool CreateFolderPath(const std::filesystem::path& path) override {
+    return real_->CreateFolderPath(path);
+  }
+  std::error_code CopyFileReplacing(const std::filesystem::path& source,
+                                    const std::filesystem::path& target) override {
     if (++copies_ == stopAtCopy_) stop_.Raise();
     return real_->CopyFileReplacing(source, target);
   }
-  void SetNormalAttributes(const std::filesystem::path& path) override { real_->SetNormalAttributes(path); }
+  void SetNormalAttributes(const std::filesystem::path& path) override {
+    real_->SetNormalAttributes(path);
+  }
 
  private:
   StopRequest& stop_;
@@ -75,8 +84,9 @@ class ExportCommandTest : public ::testing::Test {
 
 TEST_F(ExportCommandTest, ExportsAPlaylistInItsOrderAndSummarizes) {
   ASSERT_EQ(Export({u"--out", Out(), u"--flat", u"--playlist", u"0"}), kExitOk);
-  EXPECT_THAT(out_.str(), HasSubstr("Exporting music 1 of 2...... One\nExporting music 2 of 2...... Three\n"
-                                    "Successfully exported 2 of 2......\nFinished 2 of 2...... Done!\n"));
+  EXPECT_THAT(out_.str(),
+              HasSubstr("Exporting music 1 of 2...... One\nExporting music 2 of 2...... Three\n"
+                        "Successfully exported 2 of 2......\nFinished 2 of 2...... Done!\n"));
   EXPECT_THAT(out_.str(), HasSubstr("copied 2, already present 0, failed 0\n"));
   EXPECT_TRUE(std::filesystem::exists(folder_ / "out" / "Three.mp3"));
   EXPECT_FALSE(std::filesystem::exists(folder_ / "out" / "Two.mp3"));
@@ -94,12 +104,14 @@ TEST_F(ExportCommandTest, SearchesLikeTheWindowAndUsesTheStoredOptions) {
 TEST_F(ExportCommandTest, AnInterruptStopsAfterTheCurrentFile) {
   EXPECT_EQ(Export({u"--out", Out(), u"--all"}, 2), kExitIncomplete);
   EXPECT_THAT(out_.str(), HasSubstr("Successfully exported 2 of 3......\n"));
-  EXPECT_THAT(out_.str(), HasSubstr("copied 2, already present 0, failed 0\nstopped after 2 of 3 tracks\n"));
+  EXPECT_THAT(out_.str(),
+              HasSubstr("copied 2, already present 0, failed 0\nstopped after 2 of 3 tracks\n"));
 }
 
 TEST_F(ExportCommandTest, RefusalsGiveTheJobsMessagesAndTheirStatuses) {
   EXPECT_EQ(Export({u"--out", Out(), u"--search", u"nothing like it"}), kExitIncomplete);
-  EXPECT_THAT(err_.str(), HasSubstr("No iPod song selected: No music/video has been selected to export!"));
+  EXPECT_THAT(err_.str(),
+              HasSubstr("No iPod song selected: No music/video has been selected to export!"));
   EXPECT_EQ(Export({u"--out", u"", u"--all"}), kExitIncomplete);
   EXPECT_THAT(err_.str(), HasSubstr("No output folder: Please specify the output folder!"));
   EXPECT_EQ(Export({u"--out", Out(), u"--ids", u"1,99"}), kExitUsage);
@@ -107,14 +119,17 @@ TEST_F(ExportCommandTest, RefusalsGiveTheJobsMessagesAndTheirStatuses) {
   EXPECT_EQ(Export({u"--out", Out(), u"--playlist", u"1"}), kExitUsage);
   drives_ = platform::FolderDrives();
   EXPECT_EQ(Export({u"--out", Out(), u"--all"}), kExitNoDevice);
-  EXPECT_THAT(err_.str(), HasSubstr("No iPod Device Found: Make sure you have connected your iPod to your computer!"));
+  EXPECT_THAT(
+      err_.str(),
+      HasSubstr("No iPod Device Found: Make sure you have connected your iPod to your computer!"));
   EXPECT_FALSE(std::filesystem::exists(folder_ / "out"));
 }
 
 TEST(TerminalDisplay, RedrawsOneLineWithABarCutToTheTerminal) {
   std::ostringstream out, err;
   TerminalDisplay display({}, true, 40, out, err);
-  display.ShowProgress(MakeProgress(u"Exporting music ", 1, 4, u"A rather long title that will not fit"));
+  display.ShowProgress(
+      MakeProgress(u"Exporting music ", 1, 4, u"A rather long title that will not fit"));
   display.ShowProgress(MakeProgress(u"Finished ", 4, 4, u"Done!"));
   display.ShowFinish();
   display.ShowMessage(u"first\r\nsecond", u"Title");

@@ -11,7 +11,8 @@ std::optional<Options> Parse(std::vector<std::u16string> arguments) {
 }
 
 TEST(ParseOptions, ReadsListOptions) {
-  const auto options = Parse({u"list", u"--device", u"/media/ipod", u"--playlist", u"-1", u"--json"});
+  const auto options =
+      Parse({u"list", u"--device", u"/media/ipod", u"--playlist", u"-1", u"--json"});
   ASSERT_TRUE(options.has_value());
   EXPECT_EQ(options->command, Command::kList);
   EXPECT_EQ(options->device, u"/media/ipod");
@@ -35,8 +36,8 @@ namespace kestrune::cli {
 namespace {
 
 TEST(ParseOptions, ReadsExportOptions) {
-  const auto options = Parse({u"export", u"--device", u"d", u"--out", u"o", u"--flat", u"--ids", u"52,53,52",
-                              u"--playlists-m3u"});
+  const auto options = Parse({u"export", u"--device", u"d", u"--out", u"o", u"--flat", u"--ids",
+                              u"52,53,52", u"--playlists-m3u"});
   ASSERT_TRUE(options.has_value());
   EXPECT_EQ(options->command, Command::kExport);
   EXPECT_EQ(options->out, u"o");

@@ -57,8 +57,10 @@ void WriteWithLibgpod(const std::filesystem::path& file, const std::vector<GpodT
 TEST(LibgpodDatabase, ReadsBackWhatLibgpodWrote) {
   test::TempFolder folder;
   const std::vector<GpodTrack> tracks = {
-      {"Salt on the Window", "The Lantern Keepers", "Harbour Lights", "Folk", ":iPod_Control:Music:F00:ABCD.mp3", 185000, 4000000},
-      {"Caf\xC3\xA9 \xF0\x9F\x8E\xB5", "Los Hermanos", "Medianoche", "Latin", ":iPod_Control:Music:F01:EFGH.m4a", 61000, 123},
+      {"Salt on the Window", "The Lantern Keepers", "Harbour Lights", "Folk",
+       ":iPod_Control:Music:F00:ABCD.mp3", 185000, 4000000},
+      {"Caf\xC3\xA9 \xF0\x9F\x8E\xB5", "Los Hermanos", "Medianoche", "Latin",
+       ":iPod_Control:Music:F01:EFGH.m4a", 61000, 123},
       {"No Genre", "Solo", "", "", ":iPod_Control:Music:F02:IJKL.mp3", 999, 1}};
   WriteWithLibgpod(folder / "iPod_Control" / "iTunes" / "iTunesDB", tracks);
 

@@ -24,14 +24,23 @@ using ::testing::ElementsAreArray;
 // The system's files, counting the copies made.
 class CountingFiles : public platform::Files {
  public:
-  bool FileExists(const std::filesystem::path& path) const override { return real_->FileExists(path); }
-  std::uint64_t FileSizeOf(const std::filesystem::path& path) const override { return real_->FileSizeOf(path); }
-  bool CreateFolderPath(const std::filesystem::path& path) override { return real_->CreateFolderPath(path); }
-  std::error_code CopyFileReplacing(const std::filesystem::path& source, const std::filesystem::path& target) override {
+  bool FileExists(const std::filesystem::path& path) const override {
+    return real_->FileExists(path);
+  }
+  std::uint64_t FileSizeOf(const std::filesystem::path& path) const override {
+    return real_->FileSizeOf(path);
+  }
+  bool CreateFolderPath(const std::filesystem::path& path) override {
+    return real_->CreateFolderPath(path);
+  }
+  std::error_code CopyFileReplacing(const std::filesystem::path& source,
+                                    const std::filesystem::path& target) override {
     ++copies;
     return real_->CopyFileReplacing(source, target);
   }
-  void SetNormalAttributes(const std::filesystem::path& path) override { real_->SetNormalAttributes(path); }
+  void SetNormalAttributes(const std::filesystem::path& path) override {
+    real_->SetNormalAttributes(path);
+  }
   int copies = 0;
 
  private:
@@ -40,7 +49,8 @@ class CountingFiles : public platform::Files {
 
 class ExportJobTest : public ::testing::Test {
  protected:
-  void MakeDevice(std::uint32_t trackCount, std::vector<mkipod::PlaylistDescription> playlists = {}) {
+  void MakeDevice(std::uint32_t trackCount,
+                  std::vector<mkipod::PlaylistDescription> playlists = {}) {
     std::vector<mkipod::TrackDescription> tracks;
     for (std::uint32_t id = 1; id <= trackCount; ++id) {
       tracks.push_back(test::SimpleTrack(id, u"Track " + FormatDecimal(id)));
@@ -48,7 +58,8 @@ class ExportJobTest : public ::testing::Test {
     MakeDevice(std::move(tracks), std::move(playlists));
   }
 
-  void MakeDevice(std::vector<mkipod::TrackDescription> tracks, std::vector<mkipod::PlaylistDescription> playlists) {
+  void MakeDevice(std::vector<mkipod::TrackDescription> tracks,
+                  std::vector<mkipod::PlaylistDescription> playlists) {
     mkipod::DeviceDescription device;
     device.deviceName = u"Pod";
     device.tracks = std::move(tracks);
@@ -70,11 +81,13 @@ class ExportJobTest : public ::testing::Test {
   std::vector<std::string> Progress() const { return display_.CallsStartingWith("progress "); }
 
   // The copying lines of the first tracks, with the bar widths they must show.
-  static std::vector<std::string> CopyingLines(std::uint32_t total, const std::vector<int>& widths) {
+  static std::vector<std::string> CopyingLines(std::uint32_t total,
+                                               const std::vector<int>& widths) {
     std::vector<std::string> lines;
     for (std::size_t i = 1; i <= widths.size(); ++i) {
-      lines.push_back("progress Exporting music " + std::to_string(i) + " of " + std::to_string(total) +
-                      "......|" + std::to_string(widths[i - 1]) + "|Track " + std::to_string(i));
+      lines.push_back("progress Exporting music " + std::to_string(i) + " of " +
+                      std::to_string(total) + "......|" + std::to_string(widths[i - 1]) +
+                      "|Track " + std::to_string(i));
     }
     return lines;
   }
@@ -99,22 +112,26 @@ TEST_F(ExportJobTest, ChecksTheDeviceFirstThenTheTicksThenTheFolder) {
   MakeDevice(2);
   display_.outputFolder.clear();
   Run(false);
-  EXPECT_THAT(display_.calls, ElementsAre("form off",
-                                          "message No iPod Device Found|Make sure you have connected your iPod to "
-                                          "your computer!",
-                                          "form on"));
+  EXPECT_THAT(display_.calls,
+              ElementsAre("form off",
+                          "message No iPod Device Found|Make sure you have connected your iPod to "
+                          "your computer!",
+                          "form on"));
   display_.calls.clear();
   const std::vector<Track> ticked = std::move(display_.ticked);
   display_.ticked.clear();
   Run();
-  EXPECT_THAT(display_.calls, ElementsAre("form off",
-                                          "message No iPod song selected|No music/video has been selected to export!",
-                                          "form on"));
+  EXPECT_THAT(
+      display_.calls,
+      ElementsAre("form off",
+                  "message No iPod song selected|No music/video has been selected to export!",
+                  "form on"));
   display_.calls.clear();
   display_.ticked = ticked;
   const ExportReport report = Run();
   EXPECT_THAT(display_.calls,
-              ElementsAre("form off", "message No output folder|Please specify the output folder!", "form on"));
+              ElementsAre("form off", "message No output folder|Please specify the output folder!",
+                          "form on"));
   EXPECT_FALSE(report.started);
   EXPECT_FALSE(std::filesystem::exists(folder_ / "out"));
 }
@@ -130,7 +147,8 @@ TEST_F(ExportJobTest, TenTracksCountUpThenFinishWithAFullBarOnTheWorkerThread) {
   EXPECT_THAT(Progress(), ElementsAreArray(expected));
   EXPECT_EQ(display_.calls.front(), "form off");
   EXPECT_EQ(display_.calls.back(), "finish");
-  EXPECT_EQ(std::count(display_.calls.begin(), display_.calls.end(), "form on"), 0);  // until Finish
+  EXPECT_EQ(std::count(display_.calls.begin(), display_.calls.end(), "form on"),
+            0);  // until Finish
 
   ASSERT_EQ(report.copiedFiles.size(), 10u);
   for (const auto& [id, track] : library_->tracks()) {
@@ -153,7 +171,8 @@ TEST_F(ExportJobTest, TerminateDuringTheThirdFileStopsAfterItAndStillSyncsAndFin
   std::vector<std::string> expected = CopyingLines(10, {37, 73, 110});
   expected.push_back("progress Successfully exported 3 of 10......|110|");
   ASSERT_GE(progress.size(), expected.size() + 1);
-  EXPECT_THAT(std::vector<std::string>(progress.begin(), progress.begin() + 4), ElementsAreArray(expected));
+  EXPECT_THAT(std::vector<std::string>(progress.begin(), progress.begin() + 4),
+              ElementsAreArray(expected));
   EXPECT_EQ(progress.back(), "progress Finished 10 of 10......|365|Done!");
   EXPECT_EQ(report.results.size(), 3u);
   EXPECT_TRUE(std::filesystem::exists(Out("Track 3.mp3")));
@@ -175,13 +194,15 @@ TEST_F(ExportJobTest, EarlierCopiesAreRecordedAndHandedOnWithoutCopying) {
   const ExportReport second = Run();
   EXPECT_EQ(files_.copies, 4);
   ASSERT_EQ(second.results.size(), 4u);
-  for (const TrackResult& result : second.results) EXPECT_EQ(result.outcome, CopyOutcome::kAlreadyPresent);
+  for (const TrackResult& result : second.results)
+    EXPECT_EQ(result.outcome, CopyOutcome::kAlreadyPresent);
   EXPECT_EQ(second.copiedFiles.size(), 4u);
   EXPECT_EQ(media_.libraryFiles.size(), 4u);
 }
 
 TEST_F(ExportJobTest, AMissingDeviceFileIsSkippedSilently) {
-  std::vector<mkipod::TrackDescription> tracks = {test::SimpleTrack(1, u"Track 1"), test::SimpleTrack(2, u"Track 2"),
+  std::vector<mkipod::TrackDescription> tracks = {test::SimpleTrack(1, u"Track 1"),
+                                                  test::SimpleTrack(2, u"Track 2"),
                                                   test::SimpleTrack(3, u"Track 3")};
   tracks[1].media = mkipod::MediaKind::kNone;
   MakeDevice(std::move(tracks), {});
@@ -204,8 +225,8 @@ TEST_F(ExportJobTest, FiveFilesAndTwoPlaylistsThroughTheLibrarySync) {
   expected.push_back("progress Successfully exported 5 of 5......|365|");
   expected.push_back("progress Syncing music back to iTunes 1 of 5......|73|Please wait......");
   for (std::uint32_t i = 1; i <= 5; ++i) {
-    expected.push_back("progress Adding music to iTunes master playlist " + std::to_string(i) + " of 5......|" +
-                       std::to_string(i * 73) + "|Please wait......");
+    expected.push_back("progress Adding music to iTunes master playlist " + std::to_string(i) +
+                       " of 5......|" + std::to_string(i * 73) + "|Please wait......");
   }
   expected.push_back("progress Rebuilding playlist 1 of 2......|183|Please wait......");
   expected.push_back("progress Rebuilding playlist 2 of 2......|365|Please wait......");
@@ -213,7 +234,8 @@ TEST_F(ExportJobTest, FiveFilesAndTwoPlaylistsThroughTheLibrarySync) {
   EXPECT_THAT(Progress(), ElementsAreArray(expected));
   EXPECT_EQ(media_.programIds, std::vector<std::u16string>{u"iTunes.Application"});
   ASSERT_EQ(media_.playlists.size(), 2u);
-  EXPECT_EQ(media_.playlists[1].files, std::vector<std::u16string>{TextFromPath(Out("Track 5.mp3"))});
+  EXPECT_EQ(media_.playlists[1].files,
+            std::vector<std::u16string>{TextFromPath(Out("Track 5.mp3"))});
 }
 
 TEST_F(ExportJobTest, AnUnwritableTargetFailsEveryCopyButTheJobFinishes) {
@@ -230,7 +252,8 @@ TEST_F(ExportJobTest, AnUnwritableTargetFailsEveryCopyButTheJobFinishes) {
 
 #ifndef _WIN32
 TEST_F(ExportJobTest, ADiskThatFillsUpLeavesNoPartialFile) {
-  std::vector<mkipod::TrackDescription> tracks = {test::SimpleTrack(1, u"Track 1"), test::SimpleTrack(2, u"Track 2")};
+  std::vector<mkipod::TrackDescription> tracks = {test::SimpleTrack(1, u"Track 1"),
+                                                  test::SimpleTrack(2, u"Track 2")};
   tracks[0].size = 300000;
   MakeDevice(std::move(tracks), {});
   ExportReport report;

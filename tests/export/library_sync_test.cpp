@@ -14,9 +14,9 @@
 namespace kestrune {
 namespace {
 
+using platform::FakeMediaLibrary;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
-using platform::FakeMediaLibrary;
 
 Playlist MakePlaylist(std::u16string name, std::initializer_list<std::uint32_t> ids) {
   Playlist playlist{std::move(name), {}};
@@ -26,7 +26,9 @@ Playlist MakePlaylist(std::u16string name, std::initializer_list<std::uint32_t> 
 
 class LibrarySyncTest : public ::testing::Test {
  protected:
-  void Sync(std::vector<Playlist> playlists = {}) { SyncToItunes(copied_, playlists, display_, context_); }
+  void Sync(std::vector<Playlist> playlists = {}) {
+    SyncToItunes(copied_, playlists, display_, context_);
+  }
 
   FakeMediaLibrary::Playlist& PlaylistNamed(std::u16string_view name) {
     for (auto& playlist : media_.playlists) {
@@ -49,7 +51,8 @@ class LibrarySyncTest : public ::testing::Test {
 TEST_F(LibrarySyncTest, AddsEveryCopyThenFillsPlaylistsWithWhereTheLibraryKeepsThem) {
   media_.relocations[u"/out/two.mp3"] = u"/library/two.mp3";
   Sync({MakePlaylist(u"Mix", {1, 2, 9})});
-  EXPECT_THAT(media_.libraryFiles, ElementsAre(u"/out/one.mp3", u"/out/two.mp3", u"/out/three.mp3"));
+  EXPECT_THAT(media_.libraryFiles,
+              ElementsAre(u"/out/one.mp3", u"/out/two.mp3", u"/out/three.mp3"));
   EXPECT_EQ(copied_[2], u"/library/two.mp3");
   EXPECT_THAT(PlaylistNamed(u"Mix").files, ElementsAre(u"/out/one.mp3", u"/library/two.mp3"));
 }
@@ -75,10 +78,12 @@ TEST_F(LibrarySyncTest, ANameDifferingOnlyInLetterCaseIsReusedAndAnEmptyOneStill
 TEST_F(LibrarySyncTest, AMissingLibraryGivesOneMessageAndStopsAtTheOpeningStep) {
   media_.createResult = static_cast<std::int32_t>(0x800401F3);
   Sync({MakePlaylist(u"Mix", {1})});
-  EXPECT_THAT(display_.calls,
-              ElementsAre("progress Syncing music back to iTunes 1 of 3......|122|Please wait......",
-                          "message iTunes not found!|Failed to sync music/video/playlist back to iTunes.\r\n"
-                          "Please make sure you have iTunes installed on your computer!"));
+  EXPECT_THAT(
+      display_.calls,
+      ElementsAre(
+          "progress Syncing music back to iTunes 1 of 3......|122|Please wait......",
+          "message iTunes not found!|Failed to sync music/video/playlist back to iTunes.\r\n"
+          "Please make sure you have iTunes installed on your computer!"));
   EXPECT_THAT(media_.libraryFiles, IsEmpty());
 }
 
@@ -92,22 +97,26 @@ TEST_F(LibrarySyncTest, WithoutTheLibraryPlaylistThePlaylistsGetTheCopiedPaths) 
 
 TEST_F(LibrarySyncTest, FilesTheLibraryRefusesOrCannotReportKeepTheirPaths) {
   media_.refusedFiles = {u"/out/one.mp3"};
-  media_.relocations = {{u"/out/two.mp3", u"/library/two.mp3"}, {u"/out/three.mp3", u"/library/three.mp3"}};
+  media_.relocations = {{u"/out/two.mp3", u"/library/two.mp3"},
+                        {u"/out/three.mp3", u"/library/three.mp3"}};
   media_.trackCounts[u"/out/two.mp3"] = 2;
   media_.oddProgress[u"/out/three.mp3"] = 1;
   Sync();
-  EXPECT_EQ(copied_, (CopiedFiles{{1, u"/out/one.mp3"}, {2, u"/out/two.mp3"}, {3, u"/out/three.mp3"}}));
+  EXPECT_EQ(copied_,
+            (CopiedFiles{{1, u"/out/one.mp3"}, {2, u"/out/two.mp3"}, {3, u"/out/three.mp3"}}));
 }
 
 TEST_F(LibrarySyncTest, AnOperationIsWaitedForUpToAMinuteThenPassedOver) {
-  media_.relocations = {{u"/out/one.mp3", u"/library/one.mp3"}, {u"/out/two.mp3", u"/library/two.mp3"}};
+  media_.relocations = {{u"/out/one.mp3", u"/library/one.mp3"},
+                        {u"/out/two.mp3", u"/library/two.mp3"}};
   media_.busyReads[u"/out/one.mp3"] = 5999;  // done just inside the minute of 10 ms pauses
   media_.busyReads[u"/out/two.mp3"] = -1;    // never done
   Sync();
   EXPECT_EQ(copied_[1], u"/library/one.mp3");
   EXPECT_EQ(copied_[2], u"/out/two.mp3");
   EXPECT_EQ(clock_.pauses, 5999 + 6000);
-  EXPECT_THAT(media_.libraryFiles, ElementsAre(u"/out/one.mp3", u"/out/two.mp3", u"/out/three.mp3"));
+  EXPECT_THAT(media_.libraryFiles,
+              ElementsAre(u"/out/one.mp3", u"/out/two.mp3", u"/out/three.mp3"));
 }
 
 TEST_F(LibrarySyncTest, PlaylistsThatCanNeitherBeFoundNorMadeArePassedOver) {

@@ -24,8 +24,8 @@ class RecordingDisplay : public ExportDisplay {
   }
   void ShowProgressPanel() override { calls.push_back("panel"); }
   void ShowProgress(const ProgressView& progress) override {
-    calls.push_back("progress " + EncodeUtf8(progress.titleLine) + "|" + EncodeUtf8(progress.barWidth) + "|" +
-                    EncodeUtf8(progress.item));
+    calls.push_back("progress " + EncodeUtf8(progress.titleLine) + "|" +
+                    EncodeUtf8(progress.barWidth) + "|" + EncodeUtf8(progress.item));
     if (onProgress) onProgress(progress);
   }
   void ShowFinish() override { calls.push_back("finish"); }

@@ -99,7 +99,8 @@ TEST_F(SettingsTest, WithoutAMusicFolderTheProgramsDriveIsProposed) {
   EXPECT_EQ(DefaultOutputFolder(shell_), u"D:\\VizUveVuzod");
   shell_.programPath = u"/usr/bin/kestrune";
   shell_.folders[platform::SpecialFolder::kProfile] = u"/home/u";
-  EXPECT_EQ(DefaultOutputFolder(shell_), u"/home/u" + std::u16string(1, kPathSeparator) + u"VizUveVuzod");
+  EXPECT_EQ(DefaultOutputFolder(shell_),
+            u"/home/u" + std::u16string(1, kPathSeparator) + u"VizUveVuzod");
 }
 
 TEST_F(SettingsTest, WritingFailsSilentlyWhenTheKeyCannotBeMade) {

@@ -1,7 +1,7 @@
 // The database reader and the library loader on arbitrary bytes: either a library or a
 // MalformedDatabase, never a crash, a hang or a read outside a buffer.
-#include <cstdio>
 #include <cstdint>
+#include <cstdio>
 
 #include "itunesdb/record_format.h"
 #include "library/track_library.h"

@@ -39,13 +39,14 @@ class ParseTest : public ::testing::Test {
     const auto path = folder_ / "iTunesDB";
     test::WriteBytes(path, bytes);
     FileHandle file = OpenForReading(path);
-    FileChunkReader reader(file.get());
-    DbChunk root = ParseDatabase(reader);
+    FileChunkReader reader(file.get(), arena_);
+    DbChunk root = ParseDatabase(reader, arena_);
     endPosition_ = reader.Tell();
     return root;
   }
 
   test::TempFolder folder_;
+  RecordArena arena_;
   std::int32_t endPosition_ = -1;
 };
 
@@ -147,8 +148,8 @@ TEST_F(ParseTest, UnknownTagsKeepOnlyTheirHeader) {
 TEST_F(ParseTest, RefusesFilesThatEndInsideARecord) {
   const Bytes whole = Mhbd({Mhsd(1, {mkipod::RecordBuilder("mhlt", 92).AsList()})});
   // Inside the first 8 bytes of a record, inside a header, at the end of the data.
-  for (std::size_t cut : {std::size_t{3}, std::size_t{50}, std::size_t{104 + 4}, std::size_t{104 + 60},
-                          whole.size() - 1}) {
+  for (std::size_t cut : {std::size_t{3}, std::size_t{50}, std::size_t{104 + 4},
+                          std::size_t{104 + 60}, whole.size() - 1}) {
     Bytes truncated(whole.begin(), whole.begin() + static_cast<std::ptrdiff_t>(cut));
     EXPECT_THROW(Parse(truncated), MalformedDatabase) << "cut at " << cut;
   }
@@ -206,7 +207,7 @@ TEST_F(ParseTest, ReadChunkStopsAtTheHeaderOrAtTheEndOfAStringRecord) {
   const Bytes bytes = Concat({Mhsd(1, {mkipod::StringMhod(1, u"ab")})});
   test::WriteBytes(folder_ / "records", bytes);
   FileHandle file = OpenForReading(folder_ / "records");
-  FileChunkReader reader(file.get());
+  FileChunkReader reader(file.get(), arena_);
   ASSERT_TRUE(reader.ReadChunk().has_value());
   EXPECT_EQ(reader.Tell(), 96);
   const auto mhod = reader.ReadChunk();

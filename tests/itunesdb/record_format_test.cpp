@@ -19,8 +19,8 @@ TEST(RecordFormat, EachKnownTagHasItsKind) {
     EXPECT_EQ(ShapeOf(tag).kind, RecordKind::kList) << TagText(tag);
     EXPECT_EQ(ShapeOf(tag).countOffset, 8u) << TagText(tag);
   }
-  for (std::uint32_t tag : {kTagMhsd, kTagMhit, kTagMhyp, kTagMhip, kTagMhii, kTagMhni, kTagMhba,
-                            kTagMhia, kTagMhif}) {
+  for (std::uint32_t tag :
+       {kTagMhsd, kTagMhit, kTagMhyp, kTagMhip, kTagMhii, kTagMhni, kTagMhba, kTagMhia, kTagMhif}) {
     EXPECT_EQ(ShapeOf(tag).kind, RecordKind::kLength) << TagText(tag);
   }
   EXPECT_EQ(ShapeOf(kTagMhod).kind, RecordKind::kString);

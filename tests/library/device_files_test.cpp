@@ -78,7 +78,8 @@ TEST_F(DeviceFilesTest, LetterCaseOfTheDeviceMayDifferFromTheDatabase) {
   test::WriteBytes(device_ / "iPod_Control" / "Music" / "F00" / "TBA.mp3", {1});
   const auto file = LocateTrackFile(Loaded(track));
   ASSERT_TRUE(file.has_value());
-  EXPECT_TRUE(std::filesystem::equivalent(*file, device_ / "iPod_Control" / "Music" / "F00" / "TBA.mp3"));
+  EXPECT_TRUE(
+      std::filesystem::equivalent(*file, device_ / "iPod_Control" / "Music" / "F00" / "TBA.mp3"));
 }
 
 TEST_F(DeviceFilesTest, TheDatabaseIsFoundInAFolderOfOtherLetterCase) {

@@ -25,8 +25,12 @@ class RecordingDrives : public FolderDrives {
 };
 
 TEST(ListRemovableDrives, KeepsRemovableDrivesOtherThanFloppies) {
-  RecordingDrives drives({{u"A:", kDriveRemovable}, {u"b:", kDriveRemovable}, {u"C:", kDriveFixed},
-                          {u"e:", kDriveRemovable}, {u"F:", 5}, {u"G:", kDriveRemovable}});
+  RecordingDrives drives({{u"A:", kDriveRemovable},
+                          {u"b:", kDriveRemovable},
+                          {u"C:", kDriveFixed},
+                          {u"e:", kDriveRemovable},
+                          {u"F:", 5},
+                          {u"G:", kDriveRemovable}});
   std::vector<std::u16string> list{u"kept"};
   ListRemovableDrives(drives, list);
   EXPECT_EQ(list, (std::vector<std::u16string>{u"kept", u"E:", u"G:"}));

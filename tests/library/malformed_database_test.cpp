@@ -77,7 +77,8 @@ TEST_F(MalformedDatabaseTest, MissingSetsOrListsAreMalformed) {
 
 TEST_F(MalformedDatabaseTest, TheLastSetOfATypeCounts) {
   const Bytes emptyTracks = Set(1, {List("mhlt", {})});
-  EXPECT_THROW(Load(Database({emptyTracks, Set(2, {List("mhlp", {})}), Set(1, {})})), MalformedDatabase);
+  EXPECT_THROW(Load(Database({emptyTracks, Set(2, {List("mhlp", {})}), Set(1, {})})),
+               MalformedDatabase);
   EXPECT_TRUE(Load(Database({Set(1, {}), Set(2, {List("mhlp", {})}), emptyTracks})));
 }
 

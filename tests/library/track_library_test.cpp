@@ -56,7 +56,8 @@ TEST_F(TrackLibraryTest, BuildsTracksFromTheirRecords) {
   EXPECT_EQ(loaded.mhodText[6], u"Composer");
   EXPECT_EQ(loaded.mhodText[14], u"Fourteen");
   const std::u16string s(1, kPathSeparator);
-  EXPECT_EQ(loaded.devicePath, Root() + s + u"iPod_Control" + s + u"Music" + s + u"F00" + s + u"TAC.mp3");
+  EXPECT_EQ(loaded.devicePath,
+            Root() + s + u"iPod_Control" + s + u"Music" + s + u"F00" + s + u"TAC.mp3");
   EXPECT_EQ(loaded.rootLength, Root().size());
 }
 
@@ -74,8 +75,7 @@ TEST_F(TrackLibraryTest, PlaylistsHoldKnownTracksOnceInAscendingId) {
   device.deviceName = u"Device";
   device.tracks = {SimpleTrack(10, u"a"), SimpleTrack(20, u"b"), SimpleTrack(30, u"c")};
   device.playlists = {SimplePlaylist(u"Descending", {30, 20, 10, 20}),
-                      SimplePlaylist(u"Ghosts", {99, 98}),
-                      SimplePlaylist(u"Mixed", {98, 20})};
+                      SimplePlaylist(u"Ghosts", {99, 98}), SimplePlaylist(u"Mixed", {98, 20})};
   mkipod::PlaylistDescription unnamed;
   unnamed.itemIds = {10};
   device.playlists.push_back(unnamed);

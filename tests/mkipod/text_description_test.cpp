@@ -11,8 +11,10 @@ TEST(ParseDescription, ReadsEveryItem) {
   const DeviceDescription device = ParseDescription(
       "# a comment\n"
       "device \"My \\\"iPod\\\"\"\n"
-      "track id=52 title=\"Caf\xC3\xA9 \\ud800\" artist=Band location=\":iPod_Control:Music:F00:A.mp3\" "
-      "length=1000 size=123 media=tone:440 mhod=6:\"Com poser\" raw-mhod=15:20 utf8 odd=1 unknown=mhzz:16\r\n"
+      "track id=52 title=\"Caf\xC3\xA9 \\ud800\" artist=Band "
+      "location=\":iPod_Control:Music:F00:A.mp3\" "
+      "length=1000 size=123 media=tone:440 mhod=6:\"Com poser\" raw-mhod=15:20 utf8 odd=1 "
+      "unknown=mhzz:16\r\n"
       "\n"
       "playlist name=\"Road Trip\" ids=52,53,52 master positions\n"
       "dataset type=9 photo unknown=abcd:12\n");

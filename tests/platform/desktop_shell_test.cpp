@@ -30,8 +30,10 @@ class DesktopShellTest : public ::testing::Test {
     if (const char* set = std::getenv(name)) value = set;
   }
   static void Restore(const char* name, const std::optional<std::string>& value) {
-    if (value) setenv(name, value->c_str(), 1);
-    else unsetenv(name);
+    if (value)
+      setenv(name, value->c_str(), 1);
+    else
+      unsetenv(name);
   }
 
   test::TempFolder folder_;

@@ -6,11 +6,12 @@ namespace kestrune::platform {
 namespace {
 
 TEST(FileNames, KnowsWindowsDeviceNamesWithAndWithoutExtension) {
-  for (const char16_t* name : {u"CON", u"con", u"Nul.mp3", u"aux.tar.gz", u"COM1", u"lpt9.txt", u"PRN .x",
-                               u"com\u00B9"}) {
+  for (const char16_t* name :
+       {u"CON", u"con", u"Nul.mp3", u"aux.tar.gz", u"COM1", u"lpt9.txt", u"PRN .x", u"com\u00B9"}) {
     EXPECT_TRUE(IsReservedDeviceName(name)) << std::string(name, name + 3);
   }
-  for (const char16_t* name : {u"CONSOLE", u"COM0", u"COM10", u"LPT", u"xcon", u"_CON", u"Null.mp3", u""}) {
+  for (const char16_t* name :
+       {u"CONSOLE", u"COM0", u"COM10", u"LPT", u"xcon", u"_CON", u"Null.mp3", u""}) {
     EXPECT_FALSE(IsReservedDeviceName(name));
   }
 }
@@ -19,7 +20,10 @@ TEST(FileNames, MakesNamesThatStayInTheirFolder) {
   EXPECT_EQ(MakeNameAcceptable(u"", u"Fallback"), u"Fallback");
   EXPECT_EQ(MakeNameAcceptable(u"..", u"Fallback"), u"Fallback");
   EXPECT_EQ(MakeNameAcceptable(u"a. .", u"Fallback"), u"a___");
-  EXPECT_EQ(MakeNameAcceptable(u"a\x1F" u"b", u"Fallback"), u"a_b");
+  EXPECT_EQ(MakeNameAcceptable(u"a\x1F"
+                               u"b",
+                               u"Fallback"),
+            u"a_b");
   EXPECT_EQ(MakeNameAcceptable(u"AUX", u"Fallback"), kDeviceNamesReserved ? u"_AUX" : u"AUX");
   std::u16string reserved = u"a/b\\c:d*e?f\"g<h>i|j";
   ReplaceReservedCharacters(reserved);

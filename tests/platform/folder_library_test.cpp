@@ -16,7 +16,8 @@ using ::testing::ElementsAre;
 // A relative path as the playlist writes it, with the system's separator.
 std::string Relative(std::initializer_list<const char*> parts) {
   std::string path;
-  for (const char* part : parts) path += (path.empty() ? "" : std::string(1, static_cast<char>(kPathSeparator))) + part;
+  for (const char* part : parts)
+    path += (path.empty() ? "" : std::string(1, static_cast<char>(kPathSeparator))) + part;
   return path;
 }
 
@@ -49,7 +50,8 @@ class FolderLibraryTest : public ::testing::Test {
   test::TempFolder folder_;
   std::filesystem::path out_ = folder_ / "out";
   std::u16string song_;
-  FolderLibrary library_{out_ / "Playlists", [](std::u16string_view path) -> std::optional<MediaInfo> {
+  FolderLibrary library_{out_ / "Playlists",
+                         [](std::u16string_view path) -> std::optional<MediaInfo> {
                            if (path.find(u"Song") == std::u16string_view::npos) return std::nullopt;
                            return MediaInfo{u"Art\u00EFst", u"Song\nTitle", 215400};
                          }};
@@ -75,19 +77,22 @@ TEST_F(FolderLibraryTest, WritesM3u8WithRelativePathsAndExtendsItNextTime) {
   EXPECT_EQ(made->Kind(), kPlaylistKindUser);
   made->AsUserPlaylist()->AddFile(song_);
   const auto file = out_ / "Playlists" / "AC_DC Best.m3u8";
-  EXPECT_EQ(Text(file), "#EXTM3U\n#PLAYLIST:AC/DC Best\n#EXTINF:215,Art\xC3\xAFst - Song Title\n" + Relative({"..", "Artist", "Album", "Song.mp3"})  + "\n");
+  EXPECT_EQ(Text(file), "#EXTM3U\n#PLAYLIST:AC/DC Best\n#EXTINF:215,Art\xC3\xAFst - Song Title\n" +
+                            Relative({"..", "Artist", "Album", "Song.mp3"}) + "\n");
   EXPECT_THAT(Names(), ElementsAre(u"AC/DC Best"));
 
   // A later run finds it by its name and only appends.
   auto again = created_.application->LibrarySource()->Playlists()->Item(1)->AsUserPlaylist();
   test::WriteBytes(out_ / "Other.mp3", {1});
   again->AddFile(TextFromPath(out_ / "Other.mp3"));
-  EXPECT_EQ(Text(file), "#EXTM3U\n#PLAYLIST:AC/DC Best\n#EXTINF:215,Art\xC3\xAFst - Song Title\n" + Relative({"..", "Artist", "Album", "Song.mp3"}) + "\n" +
-                        "#EXTINF:-1,Other\n" + Relative({"..", "Other.mp3"})  + "\n");
+  EXPECT_EQ(Text(file), "#EXTM3U\n#PLAYLIST:AC/DC Best\n#EXTINF:215,Art\xC3\xAFst - Song Title\n" +
+                            Relative({"..", "Artist", "Album", "Song.mp3"}) + "\n" +
+                            "#EXTINF:-1,Other\n" + Relative({"..", "Other.mp3"}) + "\n");
 }
 
 TEST_F(FolderLibraryTest, ListsPlaylistFilesOfAnyExtensionCaseAndNumbersNewNamesThatClash) {
-  std::ofstream(out_ / "Playlists" / "rock.M3U8", std::ios::binary) << "#EXTM3U\n../x.mp3";  // no line end at the end
+  std::ofstream(out_ / "Playlists" / "rock.M3U8", std::ios::binary)
+      << "#EXTM3U\n../x.mp3";  // no line end at the end
   std::ofstream(out_ / "Playlists" / "notes.txt") << "not a playlist";
   EXPECT_THAT(Names(), ElementsAre(u"rock"));
   // "Rock" would be rock.m3u8 on a file system that ignores case: the new one is numbered.
@@ -100,7 +105,8 @@ TEST_F(FolderLibraryTest, ListsPlaylistFilesOfAnyExtensionCaseAndNumbersNewNames
   ASSERT_EQ(rock->Name(), u"rock");
   rock->AddFile(song_);
   EXPECT_EQ(Text(out_ / "Playlists" / "rock.M3U8"),
-            "#EXTM3U\n../x.mp3\n#EXTINF:215,Art\xC3\xAFst - Song Title\n" + Relative({"..", "Artist", "Album", "Song.mp3"})  + "\n");
+            "#EXTM3U\n../x.mp3\n#EXTINF:215,Art\xC3\xAFst - Song Title\n" +
+                Relative({"..", "Artist", "Album", "Song.mp3"}) + "\n");
 }
 
 TEST(FolderLibrary, CannotBeCreatedWhereNoFolderCanBe) {

@@ -1,8 +1,7 @@
 #include "platform/linux/key_file_store.h"
 
-#include <sys/stat.h>
-
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include <fstream>
 
@@ -31,9 +30,10 @@ TEST_F(KeyFileStoreTest, StoresStringsUnderTheRegistryKeyNames) {
   ASSERT_TRUE(key->SetString(u"OuputPath", u" /music\\x\tand\nmore \u00E9"));
   ASSERT_TRUE(key->SetString(u"Organized", u"false"));
   ASSERT_TRUE(key->SetString(u"organized", u"true"));  // one value, whatever the case
-  EXPECT_EQ(Text(file_), "[HKEY_CURRENT_USER\\Software\\Kestrune]\n"
-                         "OuputPath=\\s/music\\\\x\\tand\\nmore \xC3\xA9\n"
-                         "Organized=true\n");
+  EXPECT_EQ(Text(file_),
+            "[HKEY_CURRENT_USER\\Software\\Kestrune]\n"
+            "OuputPath=\\s/music\\\\x\\tand\\nmore \xC3\xA9\n"
+            "Organized=true\n");
 
   auto reopened = KeyFileStore(file_).OpenKey(RegistryRoot::kCurrentUser, u"software\\kestrune");
   ASSERT_NE(reopened, nullptr);
@@ -47,12 +47,16 @@ TEST_F(KeyFileStoreTest, StoresStringsUnderTheRegistryKeyNames) {
 
 TEST_F(KeyFileStoreTest, KeepsWhatItDoesNotKnowAndReplacesTheFileWhole) {
   std::filesystem::create_directories(file_.parent_path());
-  std::ofstream(file_) << "# kept\n[Other]\nx=1\n\n[HKEY_CURRENT_USER\\Software\\Kestrune]\nAddToItunes=true\n\n[Last]\ny=2\n";
+  std::ofstream(file_) << "# "
+                          "kept\n[Other]\nx=1\n\n[HKEY_CURRENT_USER\\Software\\Kestrune]"
+                          "\nAddToItunes=true\n\n[Last]\ny=2\n";
   struct stat before {};
   ASSERT_EQ(::stat(file_.c_str(), &before), 0);
-  ASSERT_TRUE(store_.CreateKey(RegistryRoot::kCurrentUser, u"Software\\Kestrune")->SetString(u"OpenTarget", u"false"));
-  EXPECT_EQ(Text(file_), "# kept\n[Other]\nx=1\n\n[HKEY_CURRENT_USER\\Software\\Kestrune]\nAddToItunes=true\n"
-                         "OpenTarget=false\n\n[Last]\ny=2\n");
+  ASSERT_TRUE(store_.CreateKey(RegistryRoot::kCurrentUser, u"Software\\Kestrune")
+                  ->SetString(u"OpenTarget", u"false"));
+  EXPECT_EQ(Text(file_),
+            "# kept\n[Other]\nx=1\n\n[HKEY_CURRENT_USER\\Software\\Kestrune]\nAddToItunes=true\n"
+            "OpenTarget=false\n\n[Last]\ny=2\n");
   // A new file was renamed over the old one; no temporary file is left beside it.
   struct stat after {};
   ASSERT_EQ(::stat(file_.c_str(), &after), 0);

@@ -46,9 +46,9 @@ class MountedDrivesTest : public ::testing::Test {
 };
 
 TEST_F(MountedDrivesTest, ListsBlockDeviceMountsAndDesktopMediaMounts) {
-  const std::u16string expected = std::u16string(u"/") + u"/" + u'\0' + u"/mnt/ipod classic/" + u'\0' +
-                                  u"/media/user/STICK/" + u'\0' + u"/run/media/user/RAM/" + u'\0' +
-                                  u"/home/" + u'\0' + u'\0';
+  const std::u16string expected = std::u16string(u"/") + u"/" + u'\0' + u"/mnt/ipod classic/" +
+                                  u'\0' + u"/media/user/STICK/" + u'\0' + u"/run/media/user/RAM/" +
+                                  u'\0' + u"/home/" + u'\0' + u'\0';
   EXPECT_EQ(Drives().LogicalDriveStrings(), expected);
 }
 
@@ -56,8 +56,8 @@ TEST_F(MountedDrivesTest, TypesFollowTheKernelFlagAndTheMountFolder) {
   MountedDrives drives = Drives();
   EXPECT_EQ(drives.DriveType(u"/"), kDriveFixed);
   EXPECT_EQ(drives.DriveType(u"/home"), kDriveFixed);
-  EXPECT_EQ(drives.DriveType(u"/mnt/ipod classic"), kDriveRemovable);    // flagged by the kernel
-  EXPECT_EQ(drives.DriveType(u"/media/user/STICK"), kDriveRemovable);    // mounted by the desktop
+  EXPECT_EQ(drives.DriveType(u"/mnt/ipod classic"), kDriveRemovable);  // flagged by the kernel
+  EXPECT_EQ(drives.DriveType(u"/media/user/STICK"), kDriveRemovable);  // mounted by the desktop
   EXPECT_EQ(drives.DriveType(u"/run/media/user/RAM"), kDriveRemovable);
   EXPECT_EQ(drives.DriveType(u"/proc"), kDriveNoRootDir);
 }

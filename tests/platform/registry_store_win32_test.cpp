@@ -1,6 +1,5 @@
-#include <windows.h>
-
 #include <gtest/gtest.h>
+#include <windows.h>
 
 #include <string>
 
@@ -18,7 +17,8 @@ class RegistryStoreTest : public ::testing::Test {
 
   void SetRaw(const wchar_t* name, DWORD type, const void* data, DWORD size) {
     HKEY key = nullptr;
-    ASSERT_EQ(RegCreateKeyExW(HKEY_CURRENT_USER, subkey_.c_str(), 0, nullptr, 0, KEY_WRITE, nullptr, &key, nullptr),
+    ASSERT_EQ(RegCreateKeyExW(HKEY_CURRENT_USER, subkey_.c_str(), 0, nullptr, 0, KEY_WRITE, nullptr,
+                              &key, nullptr),
               ERROR_SUCCESS);
     RegSetValueExW(key, name, 0, type, static_cast<const BYTE*>(data), size);
     RegCloseKey(key);
@@ -36,8 +36,8 @@ TEST_F(RegistryStoreTest, WritesTerminatedStringsThatTheRegistryReadsBack) {
 
   wchar_t buffer[64] = {};
   DWORD type = 0, size = sizeof buffer;
-  ASSERT_EQ(RegGetValueW(HKEY_CURRENT_USER, subkey_.c_str(), L"OuputPath", RRF_RT_ANY | RRF_NOEXPAND, &type, buffer,
-                         &size),
+  ASSERT_EQ(RegGetValueW(HKEY_CURRENT_USER, subkey_.c_str(), L"OuputPath",
+                         RRF_RT_ANY | RRF_NOEXPAND, &type, buffer, &size),
             ERROR_SUCCESS);
   EXPECT_EQ(type, static_cast<DWORD>(REG_SZ));
   EXPECT_EQ(size, (std::wstring(L"D:\\Music \u00E9").size() + 1) * 2);

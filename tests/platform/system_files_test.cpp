@@ -13,7 +13,8 @@ class SystemFilesTest : public ::testing::Test {
  protected:
   std::vector<std::string> Entries(const std::filesystem::path& folder) {
     std::vector<std::string> names;
-    for (const auto& entry : std::filesystem::directory_iterator(folder)) names.push_back(entry.path().filename().string());
+    for (const auto& entry : std::filesystem::directory_iterator(folder))
+      names.push_back(entry.path().filename().string());
     std::sort(names.begin(), names.end());
     return names;
   }
@@ -24,7 +25,8 @@ class SystemFilesTest : public ::testing::Test {
 
 TEST_F(SystemFilesTest, CopiesExactBytesAndReplacesAnOlderFile) {
   std::vector<unsigned char> bytes(3 << 20);
-  for (std::size_t i = 0; i < bytes.size(); ++i) bytes[i] = static_cast<unsigned char>(i * 7 + i / 4096);
+  for (std::size_t i = 0; i < bytes.size(); ++i)
+    bytes[i] = static_cast<unsigned char>(i * 7 + i / 4096);
   test::WriteBytes(folder_ / "source.bin", bytes);
   ASSERT_TRUE(files_->CreateFolderPath(folder_ / "a" / "b" / "c"));
   const auto target = folder_ / "a" / "b" / "c" / "copy.bin";

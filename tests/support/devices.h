@@ -20,7 +20,8 @@ inline mkipod::TrackDescription SimpleTrack(std::uint32_t id, std::u16string tit
   track.artist = std::move(artist);
   track.album = std::move(album);
   track.genre = u"Genre";
-  track.location = u":iPod_Control:Music:F00:T" + std::u16string(1, static_cast<char16_t>(u'A' + id % 26)) +
+  track.location = u":iPod_Control:Music:F00:T" +
+                   std::u16string(1, static_cast<char16_t>(u'A' + id % 26)) +
                    std::u16string(1, static_cast<char16_t>(u'A' + id / 26 % 26)) + u".mp3";
   track.lengthMs = 1000 * id;
   track.size = 100 + id;

@@ -16,7 +16,9 @@ class TempFolder {
   TempFolder& operator=(const TempFolder&) = delete;
 
   const std::filesystem::path& path() const { return path_; }
-  std::filesystem::path operator/(const std::filesystem::path& relative) const { return path_ / relative; }
+  std::filesystem::path operator/(const std::filesystem::path& relative) const {
+    return path_ / relative;
+  }
 
  private:
   std::filesystem::path path_;

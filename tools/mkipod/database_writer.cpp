@@ -23,7 +23,11 @@ Bytes TrackRecord(const TrackDescription& track, std::uint32_t headerLength) {
     return false;
   };
   const std::pair<std::uint32_t, const std::optional<std::u16string>*> fields[] = {
-      {1, &track.title}, {2, &track.location}, {3, &track.album}, {4, &track.artist}, {5, &track.genre}};
+      {1, &track.title},
+      {2, &track.location},
+      {3, &track.album},
+      {4, &track.artist},
+      {5, &track.genre}};
   for (const auto& [type, text] : fields) {
     if (text->has_value()) mhit.Child(StringMhod(type, **text, encoding, odd(type)));
   }
@@ -78,7 +82,8 @@ Bytes PlaylistList(const DeviceDescription& device) {
 Bytes AlbumList(const DeviceDescription& device) {
   std::map<std::u16string, std::u16string> albums;  // album to artist
   for (const TrackDescription& track : device.tracks) {
-    if (track.album && !track.album->empty()) albums.emplace(*track.album, track.artist.value_or(u""));
+    if (track.album && !track.album->empty())
+      albums.emplace(*track.album, track.artist.value_or(u""));
   }
   RecordBuilder mhla("mhla", 92);
   std::uint16_t albumId = 1;

@@ -9,7 +9,8 @@
 
 namespace kestrune::mkipod {
 
-std::filesystem::path MediaPathFor(const std::u16string& location, const std::filesystem::path& folder) {
+std::filesystem::path MediaPathFor(const std::u16string& location,
+                                   const std::filesystem::path& folder) {
   if (location.empty() || location.front() != u':') return {};
   std::filesystem::path path = folder;
   std::u16string component;
@@ -28,7 +29,8 @@ std::filesystem::path MediaPathFor(const std::u16string& location, const std::fi
 void WriteFile(const std::filesystem::path& path, const Bytes& bytes) {
   std::filesystem::create_directories(path.parent_path());
   std::ofstream out(path, std::ios::binary | std::ios::trunc);
-  out.write(reinterpret_cast<const char*>(bytes.data()), static_cast<std::streamsize>(bytes.size()));
+  out.write(reinterpret_cast<const char*>(bytes.data()),
+            static_cast<std::streamsize>(bytes.size()));
   if (!out) throw std::runtime_error("cannot write " + path.string());
 }
 
@@ -37,8 +39,9 @@ DeviceDescription WriteDevice(DeviceDescription device, const std::filesystem::p
     if (track.media == MediaKind::kNone || !track.location) continue;
     const std::filesystem::path path = MediaPathFor(*track.location, folder);
     if (path.empty()) continue;
-    const Bytes media = track.media == MediaKind::kTone ? ToneWav(track.toneHz, track.lengthMs)
-                                                        : FillerBytes(track.size.value_or(1000), track.id);
+    const Bytes media = track.media == MediaKind::kTone
+                            ? ToneWav(track.toneHz, track.lengthMs)
+                            : FillerBytes(track.size.value_or(1000), track.id);
     WriteFile(path, media);
     if (!track.size) track.size = static_cast<std::uint32_t>(media.size());
   }

@@ -13,7 +13,8 @@ namespace kestrune::mkipod {
 DeviceDescription WriteDevice(DeviceDescription device, const std::filesystem::path& folder);
 
 // Where a location puts its file below the device folder; empty for locations that get no file.
-std::filesystem::path MediaPathFor(const std::u16string& location, const std::filesystem::path& folder);
+std::filesystem::path MediaPathFor(const std::u16string& location,
+                                   const std::filesystem::path& folder);
 
 void WriteFile(const std::filesystem::path& path, const Bytes& bytes);
 

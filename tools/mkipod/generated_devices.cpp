@@ -27,7 +27,8 @@ std::u16string LocationFor(std::uint32_t index, const char16_t* extension) {
 // A small deterministic generator: the same seed gives the same device on every platform.
 class Random {
  public:
-  explicit Random(std::uint64_t seed) : state_(seed * 0x9E3779B97F4A7C15ull + 0x2545F4914F6CDD1Dull) {}
+  explicit Random(std::uint64_t seed)
+      : state_(seed * 0x9E3779B97F4A7C15ull + 0x2545F4914F6CDD1Dull) {}
   std::uint64_t Next() {
     state_ ^= state_ << 13;
     state_ ^= state_ >> 7;
@@ -52,17 +53,29 @@ struct DemoAlbum {
 };
 
 const DemoAlbum kDemoAlbums[] = {
-    {"The Lantern Keepers", "Harbour Lights", "Folk",
+    {"The Lantern Keepers",
+     "Harbour Lights",
+     "Folk",
      {"Salt on the Window", "Lamplighter", "North Pier", "Fog Signal", "Tidewater", "Homeward"}},
-    {"Mira Okafor", "Copper Skies", "Soul",
+    {"Mira Okafor",
+     "Copper Skies",
+     "Soul",
      {"Golden Hour", "Hold the Line", "Copper Skies", "Slow Burn", "Letters", "Sunday Kind"}},
-    {"Velvet Static", "Night Transmission", "Electronic",
+    {"Velvet Static",
+     "Night Transmission",
+     "Electronic",
      {"Signal Lost", "Neon Rain", "Carrier Wave", "Afterglow", "Undertow", "Static Bloom"}},
-    {"Los Hermanos Quiroga", "Café de Medianoche", "Latin",
+    {"Los Hermanos Quiroga",
+     "Café de Medianoche",
+     "Latin",
      {"Camino Largo", "Luna de Papel", "El Último Tren", "Mañana Será", "Cumbia del Río", "Adiós"}},
-    {"Brass & Timber", "Old Roads", "Americana",
+    {"Brass & Timber",
+     "Old Roads",
+     "Americana",
      {"Dust Bowl Waltz", "Pine Box", "County Line", "Iron Horse", "Porch Light", "Long Gone"}},
-    {"Saga Lindqvist", "Vinterljus", "Jazz",
+    {"Saga Lindqvist",
+     "Vinterljus",
+     "Jazz",
      {"Snöfall", "Blue Hour", "Ljus i mörkret", "Midnight Ferry", "Frost Flowers", "Vårvind"}},
 };
 
@@ -106,15 +119,15 @@ DeviceDescription DemoDevice() {
 
 DeviceDescription GeneratedDevice(const GeneratedDeviceOptions& options) {
   static const std::array<const char*, 24> kWords = {
-      "Blue", "River", "Midnight", "Echo", "Golden", "Shadow", "Paper", "Silver",
-      "Hollow", "Summer", "Glass", "Wild", "Quiet", "Electric", "Northern", "Velvet",
-      "Stone", "Fire", "Ocean", "Little", "Broken", "Distant", "Crimson", "Winter"};
+      "Blue",   "River",  "Midnight", "Echo",   "Golden", "Shadow",   "Paper",    "Silver",
+      "Hollow", "Summer", "Glass",    "Wild",   "Quiet",  "Electric", "Northern", "Velvet",
+      "Stone",  "Fire",   "Ocean",    "Little", "Broken", "Distant",  "Crimson",  "Winter"};
   static const std::array<const char*, 16> kNouns = {
-      "Heart", "Road", "Light", "Dream", "City", "Song", "Sky", "Garden",
-      "Train", "Letter", "Mountain", "Moon", "Harbour", "Window", "Fields", "Rain"};
+      "Heart", "Road",   "Light",    "Dream", "City",    "Song",   "Sky",    "Garden",
+      "Train", "Letter", "Mountain", "Moon",  "Harbour", "Window", "Fields", "Rain"};
   static const std::array<const char*, 12> kGenres = {
-      "Rock", "Pop", "Jazz", "Folk", "Electronic", "Classical",
-      "Hip-Hop", "Soul", "Country", "Blues", "Reggae", "Ambient"};
+      "Rock",    "Pop",  "Jazz",    "Folk",  "Electronic", "Classical",
+      "Hip-Hop", "Soul", "Country", "Blues", "Reggae",     "Ambient"};
 
   Random random(options.seed);
   DeviceDescription device;
@@ -125,8 +138,8 @@ DeviceDescription GeneratedDevice(const GeneratedDeviceOptions& options) {
     track.id = 1000 + i;
     track.title = U(random.Pick(kWords)) + u" " + U(random.Pick(kNouns));
     const std::uint32_t artist = random.Below(artists);
-    track.artist = U(kWords[artist % kWords.size()]) + u" " + U(kNouns[artist / kWords.size() % kNouns.size()]) +
-                   u" " + FormatDecimal(artist);
+    track.artist = U(kWords[artist % kWords.size()]) + u" " +
+                   U(kNouns[artist / kWords.size() % kNouns.size()]) + u" " + FormatDecimal(artist);
     track.album = U(random.Pick(kNouns)) + u" of " + U(random.Pick(kWords)) + u" " +
                   FormatDecimal(artist * 4 + random.Below(4));
     track.genre = U(random.Pick(kGenres));
@@ -144,8 +157,10 @@ DeviceDescription GeneratedDevice(const GeneratedDeviceOptions& options) {
     PlaylistDescription playlist;
     playlist.name = U(random.Pick(kWords)) + u" Mix " + FormatDecimal(std::uint64_t{p + 1});
     playlist.positions = true;
-    const std::uint32_t count = options.tracks == 0 ? 0 : 10 + random.Below(std::min(2000u, options.tracks));
-    for (std::uint32_t k = 0; k < count; ++k) playlist.itemIds.push_back(1000 + random.Below(options.tracks));
+    const std::uint32_t count =
+        options.tracks == 0 ? 0 : 10 + random.Below(std::min(2000u, options.tracks));
+    for (std::uint32_t k = 0; k < count; ++k)
+      playlist.itemIds.push_back(1000 + random.Below(options.tracks));
     device.playlists.push_back(std::move(playlist));
   }
   return device;

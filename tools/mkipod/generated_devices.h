@@ -14,7 +14,7 @@ struct GeneratedDeviceOptions {
   std::uint32_t tracks = 1000;
   std::uint32_t playlists = 10;
   std::uint64_t seed = 1;
-  bool media = true;               // write the media files (each `mediaSize` bytes)
+  bool media = true;  // write the media files (each `mediaSize` bytes)
   std::uint32_t mediaSize = 64;
 };
 

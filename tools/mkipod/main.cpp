@@ -18,7 +18,8 @@ using namespace kestrune::mkipod;
 const char* const kUsage =
     "usage: mkipod DESCRIPTION OUTDIR\n"
     "       mkipod --demo OUTDIR\n"
-    "       mkipod --tracks N [--playlists M] [--seed S] [--no-media] [--media-size BYTES] OUTDIR\n";
+    "       mkipod --tracks N [--playlists M] [--seed S] [--no-media] [--media-size BYTES] "
+    "OUTDIR\n";
 
 std::uint32_t Number(const char* text) {
   const auto value = kestrune::ParseDecimalU32(kestrune::DecodeUtf8(text));

@@ -7,8 +7,10 @@
 
 namespace kestrune::mkipod {
 
-RecordBuilder::RecordBuilder(std::string_view tag, std::uint32_t headerLength) : header_(headerLength) {
-  if (tag.size() != 4 || headerLength < 12) throw std::invalid_argument("bad record tag or header length");
+RecordBuilder::RecordBuilder(std::string_view tag, std::uint32_t headerLength)
+    : header_(headerLength) {
+  if (tag.size() != 4 || headerLength < 12)
+    throw std::invalid_argument("bad record tag or header length");
   for (std::size_t i = 0; i < 4; ++i) header_[i] = static_cast<unsigned char>(tag[i]);
   StoreU32Le(header_.data() + 4, headerLength);
 }
@@ -59,7 +61,8 @@ Bytes RecordBuilder::AsList(std::size_t countOffset) const {
   return record;
 }
 
-Bytes StringMhod(std::uint32_t type, std::u16string_view text, StringEncoding encoding, bool extraByte) {
+Bytes StringMhod(std::uint32_t type, std::u16string_view text, StringEncoding encoding,
+                 bool extraByte) {
   Bytes encoded;
   if (encoding == StringEncoding::kUtf8) {
     const std::string utf8 = EncodeUtf8(text);

@@ -124,17 +124,28 @@ TrackDescription ParseTrack(const std::vector<Token>& tokens, std::size_t line) 
   TrackDescription track;
   for (std::size_t i = 1; i < tokens.size(); ++i) {
     const Token& t = tokens[i];
-    if (t.key == "id") track.id = Number(t.value, line);
-    else if (t.key == "title") track.title = t.value;
-    else if (t.key == "artist") track.artist = t.value;
-    else if (t.key == "album") track.album = t.value;
-    else if (t.key == "genre") track.genre = t.value;
-    else if (t.key == "location") track.location = t.value;
-    else if (t.key == "length") track.lengthMs = Number(t.value, line);
-    else if (t.key == "size") track.size = Number(t.value, line);
-    else if (t.key == "utf8") track.utf8 = true;
-    else if (t.key == "odd") track.oddLengthTypes.push_back(Number(t.value, line));
-    else if (t.key == "unknown") track.unknownRecords.push_back(Unknown(t.value, line));
+    if (t.key == "id")
+      track.id = Number(t.value, line);
+    else if (t.key == "title")
+      track.title = t.value;
+    else if (t.key == "artist")
+      track.artist = t.value;
+    else if (t.key == "album")
+      track.album = t.value;
+    else if (t.key == "genre")
+      track.genre = t.value;
+    else if (t.key == "location")
+      track.location = t.value;
+    else if (t.key == "length")
+      track.lengthMs = Number(t.value, line);
+    else if (t.key == "size")
+      track.size = Number(t.value, line);
+    else if (t.key == "utf8")
+      track.utf8 = true;
+    else if (t.key == "odd")
+      track.oddLengthTypes.push_back(Number(t.value, line));
+    else if (t.key == "unknown")
+      track.unknownRecords.push_back(Unknown(t.value, line));
     else if (t.key == "mhod") {
       const auto [type, text] = SplitPair(t.value, line);
       track.moreStrings.push_back({Number(type, line), Unquote(EncodeUtf8(text), line)});
@@ -142,13 +153,17 @@ TrackDescription ParseTrack(const std::vector<Token>& tokens, std::size_t line) 
       const auto [type, length] = SplitPair(t.value, line);
       track.rawRecords.push_back({Number(type, line), Number(length, line)});
     } else if (t.key == "media") {
-      if (t.value == u"none") track.media = MediaKind::kNone;
-      else if (t.value == u"bytes") track.media = MediaKind::kFiller;
+      if (t.value == u"none")
+        track.media = MediaKind::kNone;
+      else if (t.value == u"bytes")
+        track.media = MediaKind::kFiller;
       else if (t.value.starts_with(u"tone:")) {
         track.media = MediaKind::kTone;
         track.toneHz = Number(t.value.substr(5), line);
-      } else Fail(line, "media is tone:HZ, bytes or none");
-    } else Fail(line, "unknown track field " + t.key);
+      } else
+        Fail(line, "media is tone:HZ, bytes or none");
+    } else
+      Fail(line, "unknown track field " + t.key);
   }
   return track;
 }
@@ -157,11 +172,16 @@ PlaylistDescription ParsePlaylist(const std::vector<Token>& tokens, std::size_t 
   PlaylistDescription playlist;
   for (std::size_t i = 1; i < tokens.size(); ++i) {
     const Token& t = tokens[i];
-    if (t.key == "name") playlist.name = t.value;
-    else if (t.key == "ids") playlist.itemIds = IdList(t.value, line);
-    else if (t.key == "master") playlist.master = true;
-    else if (t.key == "positions") playlist.positions = true;
-    else Fail(line, "unknown playlist field " + t.key);
+    if (t.key == "name")
+      playlist.name = t.value;
+    else if (t.key == "ids")
+      playlist.itemIds = IdList(t.value, line);
+    else if (t.key == "master")
+      playlist.master = true;
+    else if (t.key == "positions")
+      playlist.positions = true;
+    else
+      Fail(line, "unknown playlist field " + t.key);
   }
   return playlist;
 }
@@ -170,10 +190,14 @@ DataSetDescription ParseDataSet(const std::vector<Token>& tokens, std::size_t li
   DataSetDescription set;
   for (std::size_t i = 1; i < tokens.size(); ++i) {
     const Token& t = tokens[i];
-    if (t.key == "type") set.type = Number(t.value, line);
-    else if (t.key == "photo") set.photoTree = true;
-    else if (t.key == "unknown") set.unknownRecords.push_back(Unknown(t.value, line));
-    else Fail(line, "unknown dataset field " + t.key);
+    if (t.key == "type")
+      set.type = Number(t.value, line);
+    else if (t.key == "photo")
+      set.photoTree = true;
+    else if (t.key == "unknown")
+      set.unknownRecords.push_back(Unknown(t.value, line));
+    else
+      Fail(line, "unknown dataset field " + t.key);
   }
   return set;
 }

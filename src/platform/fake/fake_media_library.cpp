@@ -14,7 +14,8 @@ class FakeTrack : public MediaTrack {
 
 class FakeTracks : public MediaTrackCollection {
  public:
-  FakeTracks(std::u16string location, std::int32_t count) : location_(std::move(location)), count_(count) {}
+  FakeTracks(std::u16string location, std::int32_t count)
+      : location_(std::move(location)), count_(count) {}
   std::optional<std::int32_t> Count() override { return count_; }
   std::unique_ptr<MediaTrack> Item(std::int32_t index) override {
     if (index < 1 || index > count_) return nullptr;
@@ -28,11 +29,13 @@ class FakeTracks : public MediaTrackCollection {
 
 class FakeOperation : public MediaOperationStatus {
  public:
-  FakeOperation(FakeMediaLibrary& library, std::u16string path) : library_(library), path_(std::move(path)) {}
+  FakeOperation(FakeMediaLibrary& library, std::u16string path)
+      : library_(library), path_(std::move(path)) {}
 
   std::optional<AutomationBool> InProgress() override {
     ++library_.progressReads;
-    if (const auto odd = library_.oddProgress.find(path_); odd != library_.oddProgress.end()) return odd->second;
+    if (const auto odd = library_.oddProgress.find(path_); odd != library_.oddProgress.end())
+      return odd->second;
     const auto busy = library_.busyReads.find(path_);
     if (busy == library_.busyReads.end() || busy->second == 0) return kAutomationFalse;
     if (busy->second > 0) --busy->second;
@@ -42,8 +45,9 @@ class FakeOperation : public MediaOperationStatus {
   std::unique_ptr<MediaTrackCollection> Tracks() override {
     const auto relocated = library_.relocations.find(path_);
     const auto count = library_.trackCounts.find(path_);
-    return std::make_unique<FakeTracks>(relocated == library_.relocations.end() ? path_ : relocated->second,
-                                        count == library_.trackCounts.end() ? 1 : count->second);
+    return std::make_unique<FakeTracks>(
+        relocated == library_.relocations.end() ? path_ : relocated->second,
+        count == library_.trackCounts.end() ? 1 : count->second);
   }
 
  private:
@@ -53,7 +57,8 @@ class FakeOperation : public MediaOperationStatus {
 
 class FakeUserPlaylist : public MediaUserPlaylist {
  public:
-  FakeUserPlaylist(FakeMediaLibrary& library, std::size_t index) : library_(library), index_(index) {}
+  FakeUserPlaylist(FakeMediaLibrary& library, std::size_t index)
+      : library_(library), index_(index) {}
   std::optional<AutomationBool> Smart() override {
     return library_.playlists[index_].smart ? kAutomationTrue : kAutomationFalse;
   }
@@ -85,7 +90,9 @@ class FakePlaylist : public MediaPlaylist {
 class FakePlaylists : public MediaPlaylistCollection {
  public:
   explicit FakePlaylists(FakeMediaLibrary& library) : library_(library) {}
-  std::optional<std::int32_t> Count() override { return static_cast<std::int32_t>(library_.playlists.size()); }
+  std::optional<std::int32_t> Count() override {
+    return static_cast<std::int32_t>(library_.playlists.size());
+  }
   std::unique_ptr<MediaPlaylist> Item(std::int32_t index) override {
     if (index < 1 || index > static_cast<std::int32_t>(library_.playlists.size())) return nullptr;
     return std::make_unique<FakePlaylist>(library_, static_cast<std::size_t>(index - 1));

@@ -27,11 +27,11 @@ class FakeMediaLibrary : public MediaLibraryAutomation {
   bool refuseLibrarySource = false;
   bool refusePlaylists = false;
   bool refuseCreatePlaylist = false;
-  std::set<std::u16string> refusedFiles;                  // adding gives no operation
-  std::map<std::u16string, std::u16string> relocations;   // where the library files an added file
-  std::map<std::u16string, int> busyReads;                // reads of "in progress" before done; -1 never done
-  std::map<std::u16string, AutomationBool> oddProgress;   // "in progress" answers this instead
-  std::map<std::u16string, std::int32_t> trackCounts;     // tracks an operation reports (1 otherwise)
+  std::set<std::u16string> refusedFiles;                 // adding gives no operation
+  std::map<std::u16string, std::u16string> relocations;  // where the library files an added file
+  std::map<std::u16string, int> busyReads;  // reads of "in progress" before done; -1 never done
+  std::map<std::u16string, AutomationBool> oddProgress;  // "in progress" answers this instead
+  std::map<std::u16string, std::int32_t> trackCounts;  // tracks an operation reports (1 otherwise)
   std::vector<Playlist> playlists;
 
   // Record.

@@ -6,7 +6,8 @@ namespace kestrune::platform {
 
 class MemoryKey : public SettingsKey {
  public:
-  MemoryKey(MemorySettingsStore& store, MemorySettingsStore::KeyId id) : store_(store), id_(std::move(id)) {}
+  MemoryKey(MemorySettingsStore& store, MemorySettingsStore::KeyId id)
+      : store_(store), id_(std::move(id)) {}
 
   std::optional<RegistryValue> QueryValue(std::u16string_view name) const override {
     const auto& values = store_.keys_.at(id_);
@@ -35,17 +36,20 @@ std::vector<unsigned char> StringValueBytes(std::u16string_view text) {
   return bytes;
 }
 
-MemorySettingsStore::KeyId MemorySettingsStore::IdOf(RegistryRoot root, std::u16string_view subkey) {
+MemorySettingsStore::KeyId MemorySettingsStore::IdOf(RegistryRoot root,
+                                                     std::u16string_view subkey) {
   return {root, AsciiUpper(subkey)};
 }
 
-std::unique_ptr<SettingsKey> MemorySettingsStore::OpenKey(RegistryRoot root, std::u16string_view subkey) {
+std::unique_ptr<SettingsKey> MemorySettingsStore::OpenKey(RegistryRoot root,
+                                                          std::u16string_view subkey) {
   const KeyId id = IdOf(root, subkey);
   if (!keys_.contains(id)) return nullptr;
   return std::make_unique<MemoryKey>(*this, id);
 }
 
-std::unique_ptr<SettingsKey> MemorySettingsStore::CreateKey(RegistryRoot root, std::u16string_view subkey) {
+std::unique_ptr<SettingsKey> MemorySettingsStore::CreateKey(RegistryRoot root,
+                                                            std::u16string_view subkey) {
   const KeyId id = IdOf(root, subkey);
   if (!keys_.contains(id)) {
     if (refuseCreate) return nullptr;
@@ -54,12 +58,13 @@ std::unique_ptr<SettingsKey> MemorySettingsStore::CreateKey(RegistryRoot root, s
   return std::make_unique<MemoryKey>(*this, id);
 }
 
-void MemorySettingsStore::SetValue(RegistryRoot root, std::u16string_view subkey, std::u16string_view name,
-                                   RegistryValue value) {
+void MemorySettingsStore::SetValue(RegistryRoot root, std::u16string_view subkey,
+                                   std::u16string_view name, RegistryValue value) {
   keys_[IdOf(root, subkey)][AsciiUpper(name)] = std::move(value);
 }
 
-std::optional<RegistryValue> MemorySettingsStore::Value(RegistryRoot root, std::u16string_view subkey,
+std::optional<RegistryValue> MemorySettingsStore::Value(RegistryRoot root,
+                                                        std::u16string_view subkey,
                                                         std::u16string_view name) const {
   const auto key = keys_.find(IdOf(root, subkey));
   if (key == keys_.end()) return std::nullopt;

@@ -14,8 +14,10 @@ class MemorySettingsStore : public SettingsStore {
   std::unique_ptr<SettingsKey> OpenKey(RegistryRoot root, std::u16string_view subkey) override;
   std::unique_ptr<SettingsKey> CreateKey(RegistryRoot root, std::u16string_view subkey) override;
 
-  void SetValue(RegistryRoot root, std::u16string_view subkey, std::u16string_view name, RegistryValue value);
-  std::optional<RegistryValue> Value(RegistryRoot root, std::u16string_view subkey, std::u16string_view name) const;
+  void SetValue(RegistryRoot root, std::u16string_view subkey, std::u16string_view name,
+                RegistryValue value);
+  std::optional<RegistryValue> Value(RegistryRoot root, std::u16string_view subkey,
+                                     std::u16string_view name) const;
   bool HasKey(RegistryRoot root, std::u16string_view subkey) const;
 
   // When set, no key can be created (a locked-down registry).

@@ -1,7 +1,7 @@
+#include "platform/console.h"
+
 #include <sys/ioctl.h>
 #include <unistd.h>
-
-#include "platform/console.h"
 
 namespace kestrune::platform {
 

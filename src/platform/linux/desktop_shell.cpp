@@ -27,7 +27,8 @@ std::optional<std::string> UserDirsMusicFolder() {
   const std::string key = "XDG_MUSIC_DIR=\"";
   std::string line;
   while (std::getline(in, line)) {
-    if (line.compare(0, key.size(), key) != 0 || line.size() < key.size() + 1 || line.back() != '"') continue;
+    if (line.compare(0, key.size(), key) != 0 || line.size() < key.size() + 1 || line.back() != '"')
+      continue;
     std::string value = line.substr(key.size(), line.size() - key.size() - 1);
     if (value.compare(0, 5, "$HOME") == 0) value = HomeFolder() + value.substr(5);
     if (!value.empty() && value.front() == '/') return value;

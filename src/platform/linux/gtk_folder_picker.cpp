@@ -17,7 +17,8 @@ class GtkFolderPicker : public FolderPicker {
         GTK_FILE_CHOOSER_ACTION_SELECT_FOLDER, "_Cancel", GTK_RESPONSE_CANCEL, "_Select",
         GTK_RESPONSE_ACCEPT, nullptr);
     GtkFileChooser* chooser = GTK_FILE_CHOOSER(dialog);
-    // Only folders of the file system, and the user may make a new one, as the Windows picker allows.
+    // Only folders of the file system, and the user may make a new one, as the Windows picker
+    // allows.
     gtk_file_chooser_set_local_only(chooser, TRUE);
     gtk_file_chooser_set_create_folders(chooser, TRUE);
     // It opens on the desktop, as the Windows picker does, rather than on recent files.
@@ -38,6 +39,8 @@ class GtkFolderPicker : public FolderPicker {
 
 }  // namespace
 
-std::unique_ptr<FolderPicker> MakeSystemFolderPicker() { return std::make_unique<GtkFolderPicker>(); }
+std::unique_ptr<FolderPicker> MakeSystemFolderPicker() {
+  return std::make_unique<GtkFolderPicker>();
+}
 
 }  // namespace kestrune::platform

@@ -19,7 +19,8 @@ namespace {
 using Lines = std::vector<std::string>;
 
 std::string GroupName(RegistryRoot root, std::u16string_view subkey) {
-  const char* rootName = root == RegistryRoot::kCurrentUser ? "HKEY_CURRENT_USER" : "HKEY_LOCAL_MACHINE";
+  const char* rootName =
+      root == RegistryRoot::kCurrentUser ? "HKEY_CURRENT_USER" : "HKEY_LOCAL_MACHINE";
   return std::string(rootName) + "\\" + EncodeUtf8(subkey);
 }
 
@@ -39,12 +40,16 @@ std::optional<Lines> ReadLines(const std::filesystem::path& file) {
   return lines;
 }
 
-bool IsGroupLine(const std::string& line) { return line.size() >= 2 && line.front() == '[' && line.back() == ']'; }
+bool IsGroupLine(const std::string& line) {
+  return line.size() >= 2 && line.front() == '[' && line.back() == ']';
+}
 
 // The index of the group's header line, or lines.size().
 std::size_t FindGroup(const Lines& lines, const std::string& group) {
   for (std::size_t i = 0; i < lines.size(); ++i) {
-    if (IsGroupLine(lines[i]) && SameName(std::string_view(lines[i]).substr(1, lines[i].size() - 2), group)) return i;
+    if (IsGroupLine(lines[i]) &&
+        SameName(std::string_view(lines[i]).substr(1, lines[i].size() - 2), group))
+      return i;
   }
   return lines.size();
 }
@@ -55,10 +60,12 @@ std::size_t SectionEnd(const Lines& lines, std::size_t header) {
   return end;
 }
 
-std::optional<std::size_t> FindEntry(const Lines& lines, std::size_t header, std::string_view name) {
+std::optional<std::size_t> FindEntry(const Lines& lines, std::size_t header,
+                                     std::string_view name) {
   for (std::size_t i = header + 1; i < SectionEnd(lines, header); ++i) {
     const std::size_t equals = lines[i].find('=');
-    if (equals != std::string::npos && SameName(std::string_view(lines[i]).substr(0, equals), name)) return i;
+    if (equals != std::string::npos && SameName(std::string_view(lines[i]).substr(0, equals), name))
+      return i;
   }
   return std::nullopt;
 }
@@ -67,12 +74,18 @@ std::string Escape(std::string_view value) {
   std::string out;
   for (std::size_t i = 0; i < value.size(); ++i) {
     const char c = value[i];
-    if (c == '\\') out += "\\\\";
-    else if (c == '\n') out += "\\n";
-    else if (c == '\r') out += "\\r";
-    else if (c == '\t') out += "\\t";
-    else if (c == ' ' && i == 0) out += "\\s";
-    else out += c;
+    if (c == '\\')
+      out += "\\\\";
+    else if (c == '\n')
+      out += "\\n";
+    else if (c == '\r')
+      out += "\\r";
+    else if (c == '\t')
+      out += "\\t";
+    else if (c == ' ' && i == 0)
+      out += "\\s";
+    else
+      out += c;
   }
   return out;
 }
@@ -85,12 +98,18 @@ std::string Unescape(std::string_view value) {
       continue;
     }
     const char next = value[++i];
-    if (next == 's') out += ' ';
-    else if (next == 'n') out += '\n';
-    else if (next == 'r') out += '\r';
-    else if (next == 't') out += '\t';
-    else if (next == '\\') out += '\\';
-    else out += {'\\', next};
+    if (next == 's')
+      out += ' ';
+    else if (next == 'n')
+      out += '\n';
+    else if (next == 'r')
+      out += '\r';
+    else if (next == 't')
+      out += '\t';
+    else if (next == '\\')
+      out += '\\';
+    else
+      out += {'\\', next};
   }
   return out;
 }
@@ -121,7 +140,8 @@ bool WriteAtomically(const std::filesystem::path& file, const Lines& lines) {
 
 class KeyFileKey : public SettingsKey {
  public:
-  KeyFileKey(std::filesystem::path file, std::string group) : file_(std::move(file)), group_(std::move(group)) {}
+  KeyFileKey(std::filesystem::path file, std::string group)
+      : file_(std::move(file)), group_(std::move(group)) {}
 
   std::optional<RegistryValue> QueryValue(std::u16string_view name) const override {
     const std::optional<Lines> lines = ReadLines(file_);
@@ -131,7 +151,8 @@ class KeyFileKey : public SettingsKey {
     const std::optional<std::size_t> entry = FindEntry(*lines, header, EncodeUtf8(name));
     if (!entry) return std::nullopt;
     const std::string& line = (*lines)[*entry];
-    const std::u16string text = DecodeUtf8(Unescape(std::string_view(line).substr(line.find('=') + 1)));
+    const std::u16string text =
+        DecodeUtf8(Unescape(std::string_view(line).substr(line.find('=') + 1)));
     RegistryValue value{kRegSz, {}};
     for (char16_t unit : text) {
       value.data.push_back(static_cast<unsigned char>(unit & 0xFF));
@@ -143,7 +164,8 @@ class KeyFileKey : public SettingsKey {
 
   bool SetString(std::u16string_view name, std::u16string_view text) override {
     const std::string utf8Name = EncodeUtf8(name);
-    if (utf8Name.empty() || utf8Name.find_first_of("=\n\r") != std::string::npos || utf8Name.front() == '[') {
+    if (utf8Name.empty() || utf8Name.find_first_of("=\n\r") != std::string::npos ||
+        utf8Name.front() == '[') {
       return false;
     }
     // A string value ends at its first zero unit for every reader.
@@ -179,7 +201,8 @@ std::unique_ptr<SettingsKey> KeyFileStore::OpenKey(RegistryRoot root, std::u16st
   return std::make_unique<KeyFileKey>(file_, group);
 }
 
-std::unique_ptr<SettingsKey> KeyFileStore::CreateKey(RegistryRoot root, std::u16string_view subkey) {
+std::unique_ptr<SettingsKey> KeyFileStore::CreateKey(RegistryRoot root,
+                                                     std::u16string_view subkey) {
   const std::string group = GroupName(root, subkey);
   Lines lines = ReadLines(file_).value_or(Lines{});
   if (FindGroup(lines, group) == lines.size()) {
@@ -197,7 +220,9 @@ std::filesystem::path UserConfigFolder() {
   return std::filesystem::path(home != nullptr ? home : "/") / ".config";
 }
 
-std::filesystem::path UserSettingsFile() { return UserConfigFolder() / "kestrune" / "settings.ini"; }
+std::filesystem::path UserSettingsFile() {
+  return UserConfigFolder() / "kestrune" / "settings.ini";
+}
 
 std::unique_ptr<SettingsStore> MakeSystemSettingsStore() {
   return std::make_unique<KeyFileStore>(UserSettingsFile());

@@ -21,8 +21,9 @@ bool UnderDesktopMediaFolder(const std::string& mountPoint) {
 std::string UnescapeMountField(const std::string& field) {
   std::string out;
   for (std::size_t i = 0; i < field.size(); ++i) {
-    const bool octal = field[i] == '\\' && i + 3 < field.size() && field[i + 1] >= '0' && field[i + 1] <= '3' && field[i + 2] >= '0' &&
-                       field[i + 2] <= '7' && field[i + 3] >= '0' && field[i + 3] <= '7';
+    const bool octal = field[i] == '\\' && i + 3 < field.size() && field[i + 1] >= '0' &&
+                       field[i + 1] <= '3' && field[i + 2] >= '0' && field[i + 2] <= '7' &&
+                       field[i + 3] >= '0' && field[i + 3] <= '7';
     if (octal) {
       out.push_back(static_cast<char>((field[i + 1] - '0') * 64 + (field[i + 2] - '0') * 8 +
                                       (field[i + 3] - '0')));

@@ -44,7 +44,8 @@ std::error_code CopyByReadAndWrite(int in, int out) {
       return LastError();
     }
     for (ssize_t written = 0; written < got;) {
-      const ssize_t put = ::write(out, buffer.data() + written, static_cast<std::size_t>(got - written));
+      const ssize_t put =
+          ::write(out, buffer.data() + written, static_cast<std::size_t>(got - written));
       if (put < 0) {
         if (errno == EINTR) continue;
         return LastError();
@@ -62,7 +63,8 @@ std::error_code CopyContents(int in, int out) {
     if (copied == 0) return {};
     if (copied > 0) continue;
     if (errno == EINTR) continue;
-    const bool unsupported = errno == EXDEV || errno == ENOSYS || errno == EINVAL || errno == EOPNOTSUPP;
+    const bool unsupported =
+        errno == EXDEV || errno == ENOSYS || errno == EINVAL || errno == EOPNOTSUPP;
     if (first && unsupported) return CopyByReadAndWrite(in, out);
     return LastError();
   }
@@ -110,9 +112,9 @@ class PosixFiles : public Files {
 
   void SetNormalAttributes(const std::filesystem::path& path) override {
     std::error_code ignored;
-    std::filesystem::permissions(path,
-                                 std::filesystem::perms::owner_read | std::filesystem::perms::owner_write,
-                                 std::filesystem::perm_options::add, ignored);
+    std::filesystem::permissions(
+        path, std::filesystem::perms::owner_read | std::filesystem::perms::owner_write,
+        std::filesystem::perm_options::add, ignored);
   }
 };
 

@@ -1,8 +1,8 @@
-#include <windows.h>
+#include "platform/folder_picker.h"
+
 #include <objbase.h>
 #include <shlobj.h>
-
-#include "platform/folder_picker.h"
+#include <windows.h>
 
 namespace kestrune::platform {
 namespace {
@@ -34,7 +34,8 @@ class ShellFolderPicker : public FolderPicker {
     std::u16string chosen;
     if (PIDLIST_ABSOLUTE items = SHBrowseForFolderW(&request)) {
       wchar_t path[MAX_PATH] = {};
-      if (SHGetPathFromIDListW(items, path) && path[0] != L'\0') chosen.assign(path, path + wcslen(path));
+      if (SHGetPathFromIDListW(items, path) && path[0] != L'\0')
+        chosen.assign(path, path + wcslen(path));
       allocator->Free(items);
     }
     allocator->Release();
@@ -44,6 +45,8 @@ class ShellFolderPicker : public FolderPicker {
 
 }  // namespace
 
-std::unique_ptr<FolderPicker> MakeSystemFolderPicker() { return std::make_unique<ShellFolderPicker>(); }
+std::unique_ptr<FolderPicker> MakeSystemFolderPicker() {
+  return std::make_unique<ShellFolderPicker>();
+}
 
 }  // namespace kestrune::platform

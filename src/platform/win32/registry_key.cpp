@@ -44,7 +44,8 @@ LONG RegistryKey::QueryValue(const wchar_t* name, DWORD& type, std::vector<BYTE>
     LONG result = RegQueryValueExW(key_, name, nullptr, &type, nullptr, &size);
     if (result != ERROR_SUCCESS) return result;
     data.assign(size, 0);
-    result = RegQueryValueExW(key_, name, nullptr, &type, data.empty() ? nullptr : data.data(), &size);
+    result =
+        RegQueryValueExW(key_, name, nullptr, &type, data.empty() ? nullptr : data.data(), &size);
     if (result == ERROR_MORE_DATA) continue;
     if (result == ERROR_SUCCESS) data.resize(size);
     return result;
@@ -56,7 +57,8 @@ LONG RegistryKey::SetString(const wchar_t* name, std::wstring_view text) {
   if (key_ == nullptr) return ERROR_INVALID_HANDLE;
   const std::wstring terminated(text);
   const auto bytes = static_cast<DWORD>((terminated.size() + 1) * sizeof(wchar_t));
-  return RegSetValueExW(key_, name, 0, REG_SZ, reinterpret_cast<const BYTE*>(terminated.c_str()), bytes);
+  return RegSetValueExW(key_, name, 0, REG_SZ, reinterpret_cast<const BYTE*>(terminated.c_str()),
+                        bytes);
 }
 
 }  // namespace kestrune::platform

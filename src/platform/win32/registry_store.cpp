@@ -54,6 +54,8 @@ class RegistryStore : public SettingsStore {
 
 }  // namespace
 
-std::unique_ptr<SettingsStore> MakeSystemSettingsStore() { return std::make_unique<RegistryStore>(); }
+std::unique_ptr<SettingsStore> MakeSystemSettingsStore() {
+  return std::make_unique<RegistryStore>();
+}
 
 }  // namespace kestrune::platform
