@@ -31,9 +31,17 @@ if [ ! -f "$WINEPREFIX/.kestrune-ready" ]; then
   touch "$WINEPREFIX/.kestrune-ready"
 fi
 
+# The persistent server keeps the prefix's services (services.exe, winedevice.exe ...) running,
+# and they hold on to the output of the program that started them: ctest would wait for that
+# test's output to end for ever. Start them here, writing nowhere.
+wine_start_services() {
+  wine cmd /c exit </dev/null >/dev/null 2>&1 || true
+}
+
 # One server for the whole run: Windows programs started side by side (ctest -j2) would
 # otherwise race to start it, and one of them can lose its connection.
 wineserver -p 2>/dev/null || true
+wine_start_services
 
 # Maps a folder to a drive letter that Windows programs see as removable media.
 wine_map_removable_drive() {
@@ -44,6 +52,7 @@ wine_map_removable_drive() {
   wineserver -k 2>/dev/null || true
   wineserver -w
   wineserver -p 2>/dev/null || true
+  wine_start_services
 }
 
 # Stops what this file started: the wine server and, if it started one, the X server.
@@ -59,4 +68,5 @@ wine_unmap_drive() {
   wineserver -k 2>/dev/null || true
   wineserver -w
   wineserver -p 2>/dev/null || true
+  wine_start_services
 }
