@@ -13,41 +13,13 @@
 #include "platform/folder_drives.h"
 #include "platform/system.h"
 #include "support/devices.h"
+#include "support/observed_files.h"
 #include "support/temp_folder.h"
 
 namespace kestrune::cli {
 namespace {
 
 using ::testing::HasSubstr;
-
-// The system's files; a stop is asked for during the copy of the given file, as Ctrl+C would.
-class InterruptingFiles : public platform::Files {
- public:
-  InterruptingFiles(StopRequest& stop, int stopAtCopy) : stop_(stop), stopAtCopy_(stopAtCopy) {}
-  bool FileExists(const std::filesystem::path& path) const override {
-    return real_->FileExists(path);
-  }
-  std::uint64_t FileSizeOf(const std::filesystem::path& path) const override {
-    return real_->FileSizeOf(path);
-  }
-  bool CreateFolderPath(const std::filesystem::path& path) override {
-    return real_->CreateFolderPath(path);
-  }
-  std::error_code CopyFileReplacing(const std::filesystem::path& source,
-                                    const std::filesystem::path& target) override {
-    if (++copies_ == stopAtCopy_) stop_.Raise();
-    return real_->CopyFileReplacing(source, target);
-  }
-  void SetNormalAttributes(const std::filesystem::path& path) override {
-    real_->SetNormalAttributes(path);
-  }
-
- private:
-  StopRequest& stop_;
-  int stopAtCopy_;
-  int copies_ = 0;
-  std::unique_ptr<platform::Files> real_ = platform::MakeSystemFiles();
-};
 
 class ExportCommandTest : public ::testing::Test {
  protected:
@@ -67,7 +39,10 @@ class ExportCommandTest : public ::testing::Test {
     std::string error;
     const std::optional<Options> options = ParseOptions(arguments, error);
     EXPECT_TRUE(options) << error;
-    InterruptingFiles files(stop_, stopAtCopy);
+    test::ObservedFiles files;
+    files.beforeCopy = [&](int copy) {
+      if (copy == stopAtCopy) stop_.Raise();  // as Ctrl+C during that copy
+    };
     ExportEnvironment environment{settings_, shell_, files, stop_, false, 80};
     return RunExportCommand(*options, drives_, environment, out_, err_);
   }

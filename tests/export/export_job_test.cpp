@@ -10,6 +10,7 @@
 #include "platform/fake/fake_shell.h"
 #include "platform/system.h"
 #include "support/devices.h"
+#include "support/observed_files.h"
 #include "support/temp_folder.h"
 #ifndef _WIN32
 #include "support/file_size_limit.h"
@@ -20,32 +21,6 @@ namespace {
 
 using ::testing::ElementsAre;
 using ::testing::ElementsAreArray;
-
-// The system's files, counting the copies made.
-class CountingFiles : public platform::Files {
- public:
-  bool FileExists(const std::filesystem::path& path) const override {
-    return real_->FileExists(path);
-  }
-  std::uint64_t FileSizeOf(const std::filesystem::path& path) const override {
-    return real_->FileSizeOf(path);
-  }
-  bool CreateFolderPath(const std::filesystem::path& path) override {
-    return real_->CreateFolderPath(path);
-  }
-  std::error_code CopyFileReplacing(const std::filesystem::path& source,
-                                    const std::filesystem::path& target) override {
-    ++copies;
-    return real_->CopyFileReplacing(source, target);
-  }
-  void SetNormalAttributes(const std::filesystem::path& path) override {
-    real_->SetNormalAttributes(path);
-  }
-  int copies = 0;
-
- private:
-  std::unique_ptr<platform::Files> real_ = platform::MakeSystemFiles();
-};
 
 class ExportJobTest : public ::testing::Test {
  protected:
@@ -101,7 +76,7 @@ class ExportJobTest : public ::testing::Test {
   test::TempFolder folder_;
   std::optional<TrackLibrary> library_;
   test::RecordingDisplay display_;
-  CountingFiles files_;
+  test::ObservedFiles files_;
   StopRequest stop_;
   platform::FakeMediaLibrary media_;
   platform::FakeClock clock_;
