@@ -4,7 +4,7 @@
 set -euo pipefail
 
 native=(build-essential cmake ninja-build pkg-config git python3 python3-olefile
-        libgtest-dev libgmock-dev libbenchmark-dev libgpod-dev
+        libgtest-dev libgmock-dev libbenchmark-dev libgpod-dev mpv
         libcairo2-dev libpango1.0-dev libgtk-3-dev libcurl4-openssl-dev libpng-dev zlib1g-dev)
 windows=(mingw-w64 wine64 wine xvfb x11-utils x11-apps imagemagick xdotool)
 fuzz=(clang libclang-rt-14-dev)

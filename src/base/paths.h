@@ -15,6 +15,15 @@ inline constexpr char16_t kPathSeparator = u'\\';
 inline constexpr char16_t kPathSeparator = u'/';
 #endif
 
+// Windows takes the slash as a separator too.
+inline bool IsPathSeparator(char16_t unit) {
+#ifdef _WIN32
+  return unit == u'\\' || unit == u'/';
+#else
+  return unit == u'/';
+#endif
+}
+
 // Paths are made from UTF-16 program text: wide on Windows; on Linux the UTF-8 form that
 // EncodeUtf8 gives, so a lone surrogate in a device's text still names one file.
 std::filesystem::path PathFromText(std::u16string_view text);

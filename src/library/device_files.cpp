@@ -8,19 +8,11 @@
 namespace kestrune {
 namespace {
 
-bool IsSeparator(char16_t unit) {
-#ifdef _WIN32
-  return unit == u'\\' || unit == u'/';
-#else
-  return unit == u'/';
-#endif
-}
-
 std::vector<std::u16string_view> ComponentsOf(std::u16string_view path) {
   std::vector<std::u16string_view> components;
   std::size_t start = 0;
   for (std::size_t i = 0; i <= path.size(); ++i) {
-    if (i == path.size() || IsSeparator(path[i])) {
+    if (i == path.size() || IsPathSeparator(path[i])) {
       if (i > start) components.push_back(path.substr(start, i - start));
       start = i + 1;
     }
@@ -55,7 +47,7 @@ std::optional<std::filesystem::path> MatchIgnoringCase(const std::filesystem::pa
 bool StaysInsideDrive(std::u16string_view path, std::size_t rootLength) {
   if (rootLength > path.size()) return false;
   const std::u16string_view below = path.substr(rootLength);
-  if (below.empty() || !IsSeparator(below.front())) return false;
+  if (below.empty() || !IsPathSeparator(below.front())) return false;
   for (std::u16string_view component : ComponentsOf(below)) {
     if (ClimbsOut(component)) return false;
   }
