@@ -1,0 +1,70 @@
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <unordered_map>
+#include <vector>
+
+#include "html/css/computed_style.h"
+#include "html/css/stylesheet.h"
+#include "html/dom/document.h"
+
+namespace kestrune::html::css {
+
+const char16_t* MasterStyleSheetText();
+
+// The cascade for one document: the engine's own sheet, then the page's sheets in order, then
+// each element's `style` attribute, then the styles the program sets (which win over every
+// sheet). Restyling follows the dirty bits, so it costs what the change can affect.
+class StyleEngine {
+ public:
+  explicit StyleEngine(dom::Document& document);
+  StyleEngine(const StyleEngine&) = delete;
+  StyleEngine& operator=(const StyleEngine&) = delete;
+
+  void ClearPageSheets();
+  void AddPageSheet(StyleSheet sheet);
+
+  // Recomputes every style the dirty bits ask for. Elements whose `behavior` list changed are
+  // appended to `behaviorChanges` (held, so that the caller can attach and detach safely).
+  void Update(std::vector<dom::Ref<dom::Element>>* behaviorChanges = nullptr);
+
+  // Number of style computations of the last Update, and how many were shared with an
+  // element computed before (tests and benchmarks read these).
+  std::size_t lastComputed() const { return lastComputed_; }
+  std::size_t lastShared() const { return lastShared_; }
+
+ private:
+  struct IndexedRule {
+    const ComplexSelector* selector;
+    const Rule* rule;
+    std::uint32_t order;
+    std::uint8_t origin;  // 0 the engine's sheet, 1 the page's
+  };
+  struct KeyHash {
+    std::size_t operator()(const std::vector<std::uintptr_t>& key) const;
+  };
+
+  void Reindex();
+  void IndexSheet(const StyleSheet& sheet, std::uint8_t origin);
+  void Visit(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent, bool force,
+             std::vector<dom::Ref<dom::Element>>* behaviorChanges);
+  std::shared_ptr<const ComputedStyle> Compute(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent);
+  void CollectMatches(const dom::Element& element);
+
+  dom::Document& document_;
+  std::shared_ptr<const StyleSheet> master_;
+  std::vector<StyleSheet> pageSheets_;
+  std::unordered_map<std::u16string, std::vector<IndexedRule>> byId_;
+  std::unordered_map<std::u16string, std::vector<IndexedRule>> byClass_;
+  std::unordered_map<dom::Atom, std::vector<IndexedRule>> byTag_;
+  std::vector<IndexedRule> universal_;
+  std::vector<const IndexedRule*> matched_;
+  std::vector<std::uintptr_t> key_;
+  std::unordered_map<std::vector<std::uintptr_t>, std::shared_ptr<const ComputedStyle>, KeyHash> shared_;
+  std::uint32_t nextOrder_ = 0;
+  std::size_t lastComputed_ = 0;
+  std::size_t lastShared_ = 0;
+};
+
+}  // namespace kestrune::html::css
