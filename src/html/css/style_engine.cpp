@@ -56,6 +56,10 @@ std::vector<std::u16string> Words(std::u16string_view text) {
 
 }  // namespace
 
+bool IsShown(const ComputedStyle& style) {
+  return style.display != Display::kNone && style.visibility == Visibility::kVisible;
+}
+
 std::size_t StyleEngine::KeyHash::operator()(const std::vector<std::uintptr_t>& key) const {
   std::size_t hash = 1469598103934665603ull;
   for (std::uintptr_t part : key) hash = (hash ^ part) * 1099511628211ull;
@@ -182,7 +186,7 @@ std::shared_ptr<const ComputedStyle> StyleEngine::Compute(dom::Element& element,
 }
 
 void StyleEngine::Visit(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent, bool force,
-                        std::vector<dom::Ref<dom::Element>>* behaviorChanges) {
+                        StyleChanges* changes) {
   const std::uint16_t dirty = element.dirty();
   bool forceChildren = force || (dirty & dom::kSubtreeStyleDirty);
   if (force || (dirty & (dom::kStyleDirty | dom::kSubtreeStyleDirty))) {
@@ -195,8 +199,11 @@ void StyleEngine::Visit(dom::Element& element, const std::shared_ptr<const Compu
         element.MarkPaintDirty();
       }
       if (!old || !old->InheritedEqual(*fresh)) forceChildren = true;
-      if (behaviorChanges && (old ? BehaviorNames(*old) != BehaviorNames(*fresh) : !BehaviorNames(*fresh).empty())) {
-        behaviorChanges->emplace_back(&element);
+      if (changes && (old ? BehaviorNames(*old) != BehaviorNames(*fresh) : !BehaviorNames(*fresh).empty())) {
+        changes->behaviors.emplace_back(&element);
+      }
+      if (changes && old && IsShown(*old) != IsShown(*fresh)) {
+        (IsShown(*fresh) ? changes->shown : changes->hidden).emplace_back(&element);
       }
       element.SetStyle(std::move(fresh));
     }
@@ -204,19 +211,19 @@ void StyleEngine::Visit(dom::Element& element, const std::shared_ptr<const Compu
   if (forceChildren || (dirty & dom::kChildStyleDirty)) {
     const std::size_t count = element.elementCount();
     for (std::size_t i = 0; i < count; ++i) {
-      Visit(*element.ElementAt(i), element.style(), forceChildren, behaviorChanges);
+      Visit(*element.ElementAt(i), element.style(), forceChildren, changes);
     }
   }
   element.ClearDirty(dom::kStyleDirty | dom::kSubtreeStyleDirty | dom::kChildStyleDirty);
 }
 
-void StyleEngine::Update(std::vector<dom::Ref<dom::Element>>* behaviorChanges) {
+void StyleEngine::Update(StyleChanges* changes) {
   lastComputed_ = 0;
   lastShared_ = 0;
   dom::Element* root = document_.root();
   if (!root || !(root->dirty() & (dom::kStyleDirty | dom::kSubtreeStyleDirty | dom::kChildStyleDirty))) return;
   static const std::shared_ptr<const ComputedStyle> kInitial = std::make_shared<const ComputedStyle>();
-  Visit(*root, kInitial, false, behaviorChanges);
+  Visit(*root, kInitial, false, changes);
   shared_.clear();
 }
 

@@ -13,6 +13,17 @@ namespace kestrune::html::css {
 
 const char16_t* MasterStyleSheetText();
 
+// What a restyle changed that the host acts on.
+struct StyleChanges {
+  std::vector<dom::Ref<dom::Element>> behaviors;  // the `behavior` list changed
+  std::vector<dom::Ref<dom::Element>> shown;      // went from hidden (display or visibility) to shown
+  std::vector<dom::Ref<dom::Element>> hidden;     // ... and back
+  bool empty() const { return behaviors.empty() && shown.empty() && hidden.empty(); }
+};
+
+// Whether the style lets the element be seen (it may still be inside a hidden parent).
+bool IsShown(const ComputedStyle& style);
+
 // The cascade for one document: the engine's own sheet, then the page's sheets in order, then
 // each element's `style` attribute, then the styles the program sets (which win over every
 // sheet). Restyling follows the dirty bits, so it costs what the change can affect.
@@ -25,9 +36,9 @@ class StyleEngine {
   void ClearPageSheets();
   void AddPageSheet(StyleSheet sheet);
 
-  // Recomputes every style the dirty bits ask for. Elements whose `behavior` list changed are
-  // appended to `behaviorChanges` (held, so that the caller can attach and detach safely).
-  void Update(std::vector<dom::Ref<dom::Element>>* behaviorChanges = nullptr);
+  // Recomputes every style the dirty bits ask for and reports what the host must act on (the
+  // elements are held, so that the caller can attach and detach safely).
+  void Update(StyleChanges* changes = nullptr);
 
   // Number of style computations of the last Update, and how many were shared with an
   // element computed before (tests and benchmarks read these).
@@ -48,7 +59,7 @@ class StyleEngine {
   void Reindex();
   void IndexSheet(const StyleSheet& sheet, std::uint8_t origin);
   void Visit(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent, bool force,
-             std::vector<dom::Ref<dom::Element>>* behaviorChanges);
+             StyleChanges* changes);
   std::shared_ptr<const ComputedStyle> Compute(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent);
   void CollectMatches(const dom::Element& element);
 
