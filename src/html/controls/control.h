@@ -5,6 +5,7 @@
 #include <string_view>
 #include <vector>
 
+#include "html/controls/control_value.h"
 #include "html/events/dispatcher.h"
 #include "html/events/input_router.h"
 
@@ -18,22 +19,6 @@ enum ControlType : unsigned {
   kCtlRadio = 6, kCtlSelectMultiple = 7, kCtlSelectSingle = 8, kCtlTextarea = 9, kCtlHtmlarea = 10,
   kCtlPassword = 11, kCtlProgress = 12, kCtlSlider = 13, kCtlDecimal = 14, kCtlCurrency = 15,
   kCtlScrollbar = 16, kCtlHyperlink = 17, kCtlMenubar = 18, kCtlMenu = 19,
-};
-
-// A control's value: undefined, boolean, integer, real, string or array.
-struct ControlValue {
-  enum class Kind { kUndefined, kBool, kInt, kReal, kString, kArray };
-  Kind kind = Kind::kUndefined;
-  bool boolean = false;
-  int integer = 0;
-  double real = 0;
-  std::u16string string;
-  std::vector<ControlValue> items;
-
-  static ControlValue Bool(bool b) { ControlValue v; v.kind = Kind::kBool; v.boolean = b; return v; }
-  static ControlValue Int(int i) { ControlValue v; v.kind = Kind::kInt; v.integer = i; return v; }
-  static ControlValue String(std::u16string s) { ControlValue v; v.kind = Kind::kString; v.string = std::move(s); return v; }
-  bool operator==(const ControlValue&) const = default;
 };
 
 // What a control needs from the window that shows it.

@@ -247,6 +247,27 @@ RareData& Element::rare() {
   return *rare_;
 }
 
+namespace {
+
+Element* FirstElementFrom(const Element& parent, std::size_t nodeIndex) {
+  const auto& nodes = parent.nodes();
+  for (std::size_t i = nodeIndex; i < nodes.size(); ++i) {
+    if (nodes[i]->IsElement()) return static_cast<Element*>(nodes[i]);
+  }
+  return nullptr;
+}
+
+}  // namespace
+
+Element* NextElementInOrder(const Element* current, const Element* root) {
+  if (Element* child = FirstElementFrom(*current, 0)) return child;
+  for (const Element* e = current; e && e != root; e = e->parent()) {
+    if (e->parent() == nullptr) return nullptr;
+    if (Element* sibling = FirstElementFrom(*e->parent(), e->nodeIndex() + 1)) return sibling;
+  }
+  return nullptr;
+}
+
 std::u16string InnerText(const Element& element) {
   std::u16string text;
   std::vector<const Node*> pending(element.nodes().rbegin(), element.nodes().rend());

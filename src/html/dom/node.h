@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "html/dom/atoms.h"
+#include "html/dom/handle.h"
 
 namespace kestrune::html::css {
 struct ComputedStyle;
@@ -60,6 +61,8 @@ class Ref {
   Ref(Ref&& other) noexcept : node_(std::exchange(other.node_, nullptr)) {}
   template <typename U>
   Ref(Ref<U>&& other) noexcept : node_(other.Leak()) {}
+  template <typename U>
+  Ref(const Ref<U>& other) : Ref(other.get()) {}
   Ref& operator=(Ref other) noexcept {
     std::swap(node_, other.node_);
     return *this;
@@ -109,9 +112,6 @@ class Extension {
  public:
   virtual ~Extension() = default;
 };
-
-// An element procedure: (tag, element, event group, parameter block) -> handled.
-using ElementEventProc = bool (*)(void* tag, Element* element, unsigned group, void* params);
 
 struct AttachedHandler {
   ElementEventProc proc = nullptr;
@@ -218,6 +218,10 @@ class Element : public Node {
 
 inline Element* AsElement(Node* node) { return node && node->IsElement() ? static_cast<Element*>(node) : nullptr; }
 inline Text* AsText(Node* node) { return node && !node->IsElement() ? static_cast<Text*>(node) : nullptr; }
+
+// The element after `current` in document order within the subtree of `root` (which itself is
+// never returned), or none. Walks without recursion or allocation.
+Element* NextElementInOrder(const Element* current, const Element* root);
 
 // Text content of a subtree, text nodes in document order.
 std::u16string InnerText(const Element& element);

@@ -3,7 +3,7 @@
 #include <cstdint>
 
 #include "html/dom/geometry.h"
-#include "html/dom/node.h"
+#include "html/dom/handle.h"
 
 // Event groups, codes and parameter blocks: the engine's own values. Every handler receives
 // (tag, element, group, parameter block) through an element procedure (dom::ElementEventProc).

@@ -3,7 +3,7 @@
 #include <optional>
 
 #include "html/dom/geometry.h"
-#include "html/dom/node.h"
+#include "html/dom/handle.h"
 
 namespace kestrune::html::events {
 

@@ -4,7 +4,7 @@
 #include <string>
 
 #include "html/dom/geometry.h"
-#include "html/dom/node.h"
+#include "html/dom/handle.h"
 
 namespace kestrune::html::host {
 
