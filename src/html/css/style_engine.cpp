@@ -186,7 +186,7 @@ std::shared_ptr<const ComputedStyle> StyleEngine::Compute(dom::Element& element,
 }
 
 void StyleEngine::Visit(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent, bool force,
-                        StyleChanges* changes) {
+                        StyleChanges* changes, bool reported) {
   const std::uint16_t dirty = element.dirty();
   bool forceChildren = force || (dirty & dom::kSubtreeStyleDirty);
   if (force || (dirty & (dom::kStyleDirty | dom::kSubtreeStyleDirty))) {
@@ -202,8 +202,9 @@ void StyleEngine::Visit(dom::Element& element, const std::shared_ptr<const Compu
       if (changes && (old ? BehaviorNames(*old) != BehaviorNames(*fresh) : !BehaviorNames(*fresh).empty())) {
         changes->behaviors.emplace_back(&element);
       }
-      if (changes && old && IsShown(*old) != IsShown(*fresh)) {
+      if (changes && old && !reported && IsShown(*old) != IsShown(*fresh)) {
         (IsShown(*fresh) ? changes->shown : changes->hidden).emplace_back(&element);
+        reported = true;
       }
       element.SetStyle(std::move(fresh));
     }
@@ -211,7 +212,7 @@ void StyleEngine::Visit(dom::Element& element, const std::shared_ptr<const Compu
   if (forceChildren || (dirty & dom::kChildStyleDirty)) {
     const std::size_t count = element.elementCount();
     for (std::size_t i = 0; i < count; ++i) {
-      Visit(*element.ElementAt(i), element.style(), forceChildren, changes);
+      Visit(*element.ElementAt(i), element.style(), forceChildren, changes, reported);
     }
   }
   element.ClearDirty(dom::kStyleDirty | dom::kSubtreeStyleDirty | dom::kChildStyleDirty);
@@ -223,7 +224,7 @@ void StyleEngine::Update(StyleChanges* changes) {
   dom::Element* root = document_.root();
   if (!root || !(root->dirty() & (dom::kStyleDirty | dom::kSubtreeStyleDirty | dom::kChildStyleDirty))) return;
   static const std::shared_ptr<const ComputedStyle> kInitial = std::make_shared<const ComputedStyle>();
-  Visit(*root, kInitial, false, changes);
+  Visit(*root, kInitial, false, changes, false);
   shared_.clear();
 }
 

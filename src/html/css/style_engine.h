@@ -58,8 +58,9 @@ class StyleEngine {
 
   void Reindex();
   void IndexSheet(const StyleSheet& sheet, std::uint8_t origin);
+  // `reported`: an ancestor's visibility change was reported in this pass already.
   void Visit(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent, bool force,
-             StyleChanges* changes);
+             StyleChanges* changes, bool reported);
   std::shared_ptr<const ComputedStyle> Compute(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent);
   void CollectMatches(const dom::Element& element);
 

@@ -126,6 +126,7 @@ class Tokenizer {
 
   void ReadUrl(Token& token) {
     token.type = Token::Type::kUrl;
+    token.text.clear();
     while (pos_ < in_.size() && IsSpace(in_[pos_])) ++pos_;
     if (pos_ < in_.size() && (in_[pos_] == u'"' || in_[pos_] == u'\'')) {
       Token quoted;

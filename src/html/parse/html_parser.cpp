@@ -121,7 +121,8 @@ class TreeBuilder {
     if (quoted) ++pos_;
     while (pos_ < in_.size()) {
       const char16_t c = in_[pos_];
-      if (quoted ? c == quote : (IsSpace(c) || c == u'>')) break;
+      // An unquoted value ends at "/>" too: pages write <td width=10/>.
+      if (quoted ? c == quote : (IsSpace(c) || c == u'>' || (c == u'/' && pos_ + 1 < in_.size() && in_[pos_ + 1] == u'>'))) break;
       if (c == u'&') {
         const std::size_t used = DecodeCharacterReference(in_, pos_, value);
         if (used > 0) {
