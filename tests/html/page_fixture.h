@@ -59,7 +59,7 @@ class PageTest : public ::testing::Test {
     return handled;
   }
 
-  void Type(std::u16string_view text) {
+  void TypeText(std::u16string_view text) {
     for (char16_t c : text) Key(events::kKeyChar, c);
   }
 
