@@ -100,8 +100,8 @@ void Window::ElementsLeaving(Element& subtree) {
                 popups_.end());
   for (Element* element : ElementsOf(subtree)) {
     dispatcher_->DetachAll(*element, false);
-    // Held elements get their style (and so their behaviors) anew if they come back.
-    if (element->refCount() > 1 || element == &subtree) element->SetStyle(nullptr);
+    // Behaviors come back with a fresh style if a held element returns to the document.
+    if (element->style() && !css::BehaviorNames(*element->style()).empty()) element->SetStyle(nullptr);
   }
   if (document_->root()) dispatcher_->DropTimersOutside(*document_->root());
 }
