@@ -144,7 +144,8 @@ DomResult HTMLayoutSetElementState(HELEMENT he, unsigned bitsToSet, unsigned bit
   if (window && (bitsToClear & dom::kStateFocus) && window->input().focus() == he) window->input().SetFocus(nullptr, false);
   he->SetState((he->state() & ~bitsToClear) | bitsToSet);
   if (window) {
-    if (update) window->Redraw(he, false);
+    // "Update" means the view shows the change before the call returns.
+    if (update) window->Redraw(he, true);
     else window->Update();
   }
   return DomResult::kOk;

@@ -106,7 +106,8 @@ DomResult HTMLayoutGetNthAttribute(HELEMENT he, unsigned n, std::string* name, s
 DomResult HTMLayoutGetStyleAttribute(HELEMENT he, const char* name, std::optional<std::u16string>* value);
 DomResult HTMLayoutSetStyleAttribute(HELEMENT he, const char* name, const char16_t* value);
 DomResult HTMLayoutGetElementState(HELEMENT he, unsigned* state);
-// Setting or clearing the focus bit moves the window's focus.
+// Setting or clearing the focus bit moves the window's focus; with `update` the view is
+// repainted before the call returns.
 DomResult HTMLayoutSetElementState(HELEMENT he, unsigned bitsToSet, unsigned bitsToClear, bool update);
 DomResult HTMLayoutUpdateElement(HELEMENT he, bool renderNow);
 DomResult HTMLayoutGetElementInnerText16(HELEMENT he, std::u16string* text);
