@@ -143,6 +143,9 @@ TEST_F(CascadeTest, RestylesOnlyWhatAChangeCanAffect) {
   styles_.Update();
   EXPECT_EQ(styles_.lastComputed(), 3u);
   EXPECT_EQ(Style(u"c1").color, 0xFFFF0000u);
+  // The rows' own styles stay alike; their cells must not be taken for one another.
+  EXPECT_TRUE(*ById(u"r1")->style() == *ById(u"r2")->style());
+  EXPECT_EQ(ById(u"r2")->ElementAt(0)->style()->color, 0xFF000000u);
 
   ById(u"r2")->SetState(dom::kStateExpanded);  // tested nowhere
   styles_.Update();

@@ -74,7 +74,7 @@ TEST(HtmlParser, IgnoresStrayEndTagsAndClosesWhatIsLeftOpen) {
 
 TEST(HtmlParser, DecodesCharacterReferencesAndKeepsBrokenOnesAsText) {
   auto nodes = Fragment(u"a&amp;b&lt;&gt;&quot;&apos;&nbsp;&#65;&#x42;&#x1F600;&bogus;&#;&amp<i title='&lt;&#38;'>");
-  const std::u16string text = dom::AsText(nodes[0].get())->text();
+  const std::u16string text(dom::AsText(nodes[0].get())->text());
   EXPECT_EQ(text, std::u16string(u"a&b<>\"'\u00A0AB") + u"\U0001F600" + u"&bogus;&#;&");
   EXPECT_EQ(*E(nodes[1])->Attr(dom::InternName("title")), u"<&");
 }

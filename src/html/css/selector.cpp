@@ -478,6 +478,8 @@ std::optional<std::vector<ComplexSelector>> ParseSelectorList(std::u16string_vie
   return ParseSelectorList(tokens, 0, tokens.size());
 }
 
+bool MatchesPseudo(const PseudoTest& pseudo, const dom::Element& element) { return PseudoMatches(pseudo, element); }
+
 bool Matches(const ComplexSelector& selector, const dom::Element& element) {
   return !selector.compounds.empty() && MatchFrom(selector, selector.compounds.size() - 1, element);
 }

@@ -54,6 +54,7 @@ std::optional<std::vector<ComplexSelector>> ParseSelectorList(const std::vector<
 std::optional<std::vector<ComplexSelector>> ParseSelectorList(std::u16string_view text);
 
 bool Matches(const ComplexSelector& selector, const dom::Element& element);
+bool MatchesPseudo(const PseudoTest& pseudo, const dom::Element& element);
 bool MatchesAny(const std::vector<ComplexSelector>& selectors, const dom::Element& element);
 
 // Adds what the selector tests to the document's invalidation features.

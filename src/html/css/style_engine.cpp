@@ -78,8 +78,28 @@ void StyleEngine::AddPageSheet(StyleSheet sheet) {
   Reindex();
 }
 
+void StyleEngine::CollectStructural(const std::vector<ComplexSelector>& selectors) {
+  for (const ComplexSelector& selector : selectors) {
+    for (const Compound& compound : selector.compounds) {
+      for (const PseudoTest& pseudo : compound.pseudos) {
+        using Kind = PseudoTest::Kind;
+        if (pseudo.kind == Kind::kNot) {
+          CollectStructural(pseudo.negated);
+          continue;
+        }
+        if (pseudo.kind == Kind::kState || pseudo.kind == Kind::kEnabled || pseudo.kind == Kind::kRoot) continue;
+        const bool known = std::any_of(structural_.begin(), structural_.end(), [&](const StructuralTest& t) {
+          return t.pseudo.kind == pseudo.kind && t.pseudo.a == pseudo.a && t.pseudo.b == pseudo.b;
+        });
+        if (!known) structural_.push_back({pseudo});
+      }
+    }
+  }
+}
+
 void StyleEngine::IndexSheet(const StyleSheet& sheet, std::uint8_t origin) {
   for (const Rule& rule : sheet.rules) {
+    CollectStructural(rule.selectors);
     for (const ComplexSelector& selector : rule.selectors) {
       CollectFeatures(selector, document_.features());
       const Compound& subject = selector.compounds.back();
@@ -98,9 +118,12 @@ void StyleEngine::Reindex() {
   byTag_.clear();
   universal_.clear();
   nextOrder_ = 0;
+  structural_.clear();
   document_.features() = dom::StyleFeatures{};
   IndexSheet(*master_, 0);
   for (const StyleSheet& sheet : pageSheets_) IndexSheet(sheet, 1);
+  std::sort(document_.features().attributes.begin(), document_.features().attributes.end());
+  signatures_ = !document_.features().siblingCombinators && structural_.size() <= 64;
   if (document_.root()) document_.root()->MarkStyleDirty(true);
 }
 
@@ -137,12 +160,47 @@ void StyleEngine::CollectMatches(const dom::Element& element) {
   matched_.erase(std::unique(matched_.begin(), matched_.end()), matched_.end());
 }
 
+std::uint32_t StyleEngine::ChainOf(const dom::Element& element, std::uint32_t parentChain) {
+  const dom::StyleFeatures& features = document_.features();
+  signature_.clear();
+  signature_.push_back(element.tag());
+  signature_.push_back(element.state() & features.states);
+  std::uint64_t bits = 0;
+  const dom::Element* parent = element.parent();
+  for (std::size_t i = 0; i < structural_.size(); ++i) {
+    if (parent && MatchesPseudo(structural_[i].pseudo, element)) bits |= std::uint64_t{1} << i;
+  }
+  signature_.push_back(static_cast<std::uintptr_t>(bits));
+  for (dom::Atom atom : features.attributes) {
+    const std::u16string* value = element.Attr(atom);
+    if (value == nullptr) {
+      signature_.push_back(0);
+      continue;
+    }
+    auto [it, added] = values_.try_emplace(*value, static_cast<std::uint32_t>(values_.size() + 1));
+    signature_.push_back(it->second);
+  }
+  auto [sig, newSignature] = signatureIds_.try_emplace(signature_, static_cast<std::uint32_t>(signatureIds_.size() + 1));
+  const std::uint64_t link = (std::uint64_t{parentChain} << 32) | sig->second;
+  auto [chain, newChain] = chains_.try_emplace(link, static_cast<std::uint32_t>(chains_.size() + 1));
+  return chain->second;
+}
+
 std::shared_ptr<const ComputedStyle> StyleEngine::Compute(dom::Element& element,
-                                                          const std::shared_ptr<const ComputedStyle>& parent) {
-  CollectMatches(element);
+                                                          const std::shared_ptr<const ComputedStyle>& parent,
+                                                          std::uint32_t chain) {
   const dom::RareData* rare = element.rareIfAny();
   const bool personal = element.HasAttr(dom::kAtomStyle) || (rare && !rare->runtimeStyle.empty());
-  if (!personal) {
+  const std::pair<std::uintptr_t, std::uint32_t> chainKey{reinterpret_cast<std::uintptr_t>(parent.get()), chain};
+  if (!personal && chain != 0) {
+    auto found = byChain_.find(chainKey);
+    if (found != byChain_.end()) {
+      ++lastShared_;
+      return found->second;
+    }
+  }
+  CollectMatches(element);
+  if (!personal && chain == 0) {
     key_.assign(1, reinterpret_cast<std::uintptr_t>(parent.get()));
     for (const IndexedRule* rule : matched_) key_.push_back(reinterpret_cast<std::uintptr_t>(rule));
     auto found = shared_.find(key_);
@@ -181,17 +239,21 @@ std::shared_ptr<const ComputedStyle> StyleEngine::Compute(dom::Element& element,
     if (border.currentColor) border.color = style->color;
   }
   std::shared_ptr<const ComputedStyle> result = std::move(style);
-  if (!personal) shared_.emplace(key_, result);
+  if (!personal && chain != 0) byChain_.emplace(chainKey, result);
+  else if (!personal) shared_.emplace(key_, result);
   return result;
 }
 
-void StyleEngine::Visit(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent, bool force,
-                        StyleChanges* changes, bool reported) {
+void StyleEngine::Visit(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent,
+                        std::uint32_t parentChain, bool force, StyleChanges* changes, bool reported) {
   const std::uint16_t dirty = element.dirty();
   bool forceChildren = force || (dirty & dom::kSubtreeStyleDirty);
-  if (force || (dirty & (dom::kStyleDirty | dom::kSubtreeStyleDirty))) {
+  const bool recompute = force || (dirty & (dom::kStyleDirty | dom::kSubtreeStyleDirty));
+  const bool descend = forceChildren || (dirty & dom::kChildStyleDirty);
+  const std::uint32_t chain = signatures_ && (recompute || descend) ? ChainOf(element, parentChain) : 0;
+  if (recompute) {
     std::shared_ptr<const ComputedStyle> old = element.style();
-    std::shared_ptr<const ComputedStyle> fresh = Compute(element, parent);
+    std::shared_ptr<const ComputedStyle> fresh = Compute(element, parent, chain);
     ++lastComputed_;
     if (old != fresh) {
       if (!old || !(*old == *fresh)) {
@@ -210,9 +272,8 @@ void StyleEngine::Visit(dom::Element& element, const std::shared_ptr<const Compu
     }
   }
   if (forceChildren || (dirty & dom::kChildStyleDirty)) {
-    const std::size_t count = element.elementCount();
-    for (std::size_t i = 0; i < count; ++i) {
-      Visit(*element.ElementAt(i), element.style(), forceChildren, changes, reported);
+    for (dom::Node* node : element.nodes()) {
+      if (node->IsElement()) Visit(*static_cast<dom::Element*>(node), element.style(), chain, forceChildren, changes, reported);
     }
   }
   element.ClearDirty(dom::kStyleDirty | dom::kSubtreeStyleDirty | dom::kChildStyleDirty);
@@ -224,8 +285,12 @@ void StyleEngine::Update(StyleChanges* changes) {
   dom::Element* root = document_.root();
   if (!root || !(root->dirty() & (dom::kStyleDirty | dom::kSubtreeStyleDirty | dom::kChildStyleDirty))) return;
   static const std::shared_ptr<const ComputedStyle> kInitial = std::make_shared<const ComputedStyle>();
-  Visit(*root, kInitial, false, changes, false);
+  Visit(*root, kInitial, 0, false, changes, false);
   shared_.clear();
+  byChain_.clear();
+  chains_.clear();
+  signatureIds_.clear();
+  values_.clear();
 }
 
 }  // namespace kestrune::html::css

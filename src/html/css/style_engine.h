@@ -55,13 +55,25 @@ class StyleEngine {
   struct KeyHash {
     std::size_t operator()(const std::vector<std::uintptr_t>& key) const;
   };
+  struct PairHash {
+    std::size_t operator()(const std::pair<std::uintptr_t, std::uint32_t>& key) const {
+      return std::hash<std::uintptr_t>{}(key.first) * 31 + key.second;
+    }
+  };
+  // A structural pseudo-class some selector tests (its result is part of an element's signature).
+  struct StructuralTest {
+    PseudoTest pseudo;
+  };
 
   void Reindex();
   void IndexSheet(const StyleSheet& sheet, std::uint8_t origin);
   // `reported`: an ancestor's visibility change was reported in this pass already.
-  void Visit(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent, bool force,
-             StyleChanges* changes, bool reported);
-  std::shared_ptr<const ComputedStyle> Compute(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent);
+  void Visit(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent, std::uint32_t parentChain,
+             bool force, StyleChanges* changes, bool reported);
+  std::shared_ptr<const ComputedStyle> Compute(dom::Element& element, const std::shared_ptr<const ComputedStyle>& parent,
+                                               std::uint32_t chain);
+  std::uint32_t ChainOf(const dom::Element& element, std::uint32_t parentChain);
+  void CollectStructural(const std::vector<ComplexSelector>& selectors);
   void CollectMatches(const dom::Element& element);
 
   dom::Document& document_;
@@ -74,6 +86,19 @@ class StyleEngine {
   std::vector<const IndexedRule*> matched_;
   std::vector<std::uintptr_t> key_;
   std::unordered_map<std::vector<std::uintptr_t>, std::shared_ptr<const ComputedStyle>, KeyHash> shared_;
+
+  // Matched rules depend only on what selectors test of the element and its ancestors. An
+  // element's signature holds exactly that (tag, tested states and attribute values, results of
+  // the structural pseudo-classes); equal chains of signatures from the root match the same
+  // rules, so alike cousins (the cells of many rows) are matched once. Not used when sibling
+  // combinators exist, since then siblings would count too.
+  bool signatures_ = true;
+  std::vector<StructuralTest> structural_;
+  std::unordered_map<std::vector<std::uintptr_t>, std::uint32_t, KeyHash> signatureIds_;
+  std::unordered_map<std::uint64_t, std::uint32_t> chains_;
+  std::unordered_map<std::u16string, std::uint32_t> values_;
+  std::unordered_map<std::pair<std::uintptr_t, std::uint32_t>, std::shared_ptr<const ComputedStyle>, PairHash> byChain_;
+  std::vector<std::uintptr_t> signature_;
   std::uint32_t nextOrder_ = 0;
   std::size_t lastComputed_ = 0;
   std::size_t lastShared_ = 0;

@@ -1,11 +1,41 @@
 #include "html/dom/node.h"
 
 #include <algorithm>
+#include <cstddef>
+#include <memory_resource>
+#include <new>
 
 #include "html/dom/document.h"
 
 namespace kestrune::html::dom {
 namespace {
+
+#if defined(__SANITIZE_ADDRESS__)
+#define KESTRUNE_NODE_POOL 0
+#elif defined(__has_feature)
+#if __has_feature(address_sanitizer)
+#define KESTRUNE_NODE_POOL 0
+#endif
+#endif
+#ifndef KESTRUNE_NODE_POOL
+#define KESTRUNE_NODE_POOL 1
+#endif
+
+// Nodes come and go by the hundred thousand when a big table is replaced: they are kept in a
+// pool of their own sizes. Like the rest of the engine it serves the UI thread only. It lives
+// until the process ends, so that nodes freed late (by statics) still have it. Sanitizer builds
+// use the ordinary heap, which checks every node's lifetime.
+#if KESTRUNE_NODE_POOL
+std::pmr::unsynchronized_pool_resource& NodeMemory() {
+  static auto* pool = new std::pmr::unsynchronized_pool_resource();
+  return *pool;
+}
+void* AllocateNode(std::size_t size) { return NodeMemory().allocate(size, alignof(std::max_align_t)); }
+void FreeNode(void* memory, std::size_t size) { NodeMemory().deallocate(memory, size, alignof(std::max_align_t)); }
+#else
+void* AllocateNode(std::size_t size) { return ::operator new(size); }
+void FreeNode(void* memory, std::size_t size) { ::operator delete(memory, size); }
+#endif
 
 bool Contains(const std::vector<Atom>& atoms, Atom atom) {
   return std::find(atoms.begin(), atoms.end(), atom) != atoms.end();
@@ -28,19 +58,26 @@ void Node::Release() {
       element->children_.clear();
       delete element;
     } else {
-      delete static_cast<Text*>(node);
+      Text::Destroy(static_cast<Text*>(node));
     }
   }
 }
 
-Ref<Text> Text::Create(std::u16string text) { return Ref<Text>(new Text(std::move(text))); }
+void* Element::operator new(std::size_t size) { return AllocateNode(size); }
+void Element::operator delete(void* memory, std::size_t size) { FreeNode(memory, size); }
 
-void Text::SetText(std::u16string text) {
-  text_ = std::move(text);
-  if (Element* parent = this->parent()) {
-    parent->MarkLayoutDirty();
-    parent->MarkPaintDirty();
-  }
+Ref<Text> Text::Create(std::u16string_view text) {
+  static_assert(sizeof(Text) % alignof(char16_t) == 0);
+  void* memory = AllocateNode(sizeof(Text) + text.size() * sizeof(char16_t));
+  Text* node = ::new (memory) Text(text.size());
+  std::copy(text.begin(), text.end(), reinterpret_cast<char16_t*>(node + 1));
+  return Ref<Text>(node);
+}
+
+void Text::Destroy(Text* text) {
+  const std::size_t size = sizeof(Text) + text->length_ * sizeof(char16_t);
+  text->~Text();
+  FreeNode(text, size);
 }
 
 Ref<Element> Element::Create(Atom tag) { return Ref<Element>(new Element(tag)); }
@@ -148,6 +185,22 @@ void Element::ChildrenChanged() {
 }
 
 void Element::AppendChild(Ref<Node> child) { InsertNodeAt(children_.size(), std::move(child)); }
+
+void Element::AppendChildren(std::vector<Ref<Node>>& nodes) {
+  if (nodes.empty()) return;
+  const std::size_t from = children_.size();
+  children_.reserve(from + nodes.size());
+  for (Ref<Node>& child : nodes) {
+    if (!child) continue;
+    if (Element* oldParent = child->parent()) oldParent->RemoveChild(child.get());
+    Node* node = child.Leak();
+    children_.push_back(node);
+    Adopt(node);
+  }
+  nodes.clear();
+  Renumber(from);
+  ChildrenChanged();
+}
 
 void Element::InsertElementAt(std::size_t elementIndex, Ref<Node> child) {
   if (!child) return;

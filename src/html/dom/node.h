@@ -88,17 +88,18 @@ class Ref {
   T* node_ = nullptr;
 };
 
+// A text node keeps its characters right behind itself: one allocation per text.
 class Text : public Node {
  public:
-  static Ref<Text> Create(std::u16string text);
-  const std::u16string& text() const { return text_; }
-  void SetText(std::u16string text);
+  static Ref<Text> Create(std::u16string_view text);
+  std::u16string_view text() const { return {reinterpret_cast<const char16_t*>(this + 1), length_}; }
 
  private:
   friend class Node;
-  explicit Text(std::u16string text) : Node(false), text_(std::move(text)) {}
+  explicit Text(std::size_t length) : Node(false), length_(length) {}
   ~Text() = default;
-  std::u16string text_;
+  static void Destroy(Text* text);
+  std::size_t length_;
 };
 
 struct Attribute {
@@ -140,6 +141,8 @@ enum DirtyBit : std::uint16_t {
 
 class Element : public Node {
  public:
+  static void* operator new(std::size_t size);
+  static void operator delete(void* memory, std::size_t size);
   static Ref<Element> Create(Atom tag);
 
   Atom tag() const { return tag_; }
@@ -166,6 +169,8 @@ class Element : public Node {
   std::size_t elementIndex() const;
 
   void AppendChild(Ref<Node> child);
+  // Appends the nodes, in order, as one change; the list is left empty (with its room).
+  void AppendChildren(std::vector<Ref<Node>>& nodes);
   // Inserts before the element child at elementIndex (appends when past the end).
   void InsertElementAt(std::size_t elementIndex, Ref<Node> child);
   void InsertNodeAt(std::size_t nodeIndex, Ref<Node> child);

@@ -142,13 +142,10 @@ void Window::AddSheet(std::u16string_view text, const std::u16string& sheetUrl, 
 }
 
 void Window::RequestImages(Element& subtree) {
-  std::vector<Element*> pending{&subtree};
-  while (!pending.empty()) {
-    Element* e = pending.back();
-    pending.pop_back();
-    for (std::size_t i = e->elementCount(); i > 0; --i) pending.push_back(e->ElementAt(i - 1));
+  for (Element* e = &subtree; e; e = dom::NextElementInOrder(e, &subtree)) {
+    if (e->tag() != dom::kAtomImg) continue;
     const std::u16string* src = e->Attr(dom::kAtomSrc);
-    if (e->tag() != dom::kAtomImg || src == nullptr || src->empty()) continue;
+    if (src == nullptr || src->empty()) continue;
     const std::u16string url = CombineUrl(document_->url(), *src);
     if (resources_.contains(url)) continue;
     if (auto data = Fetch(url, events::kDataImage, e)) resources_[url] = std::move(*data);

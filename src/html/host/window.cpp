@@ -18,16 +18,13 @@ namespace {
 // a page that keeps doing so must not hang the window.
 constexpr int kMaxUpdateRounds = 8;
 
-std::vector<Element*> ElementsOf(Element& subtree) {
-  std::vector<Element*> all;
-  std::vector<Element*> pending{&subtree};
-  while (!pending.empty()) {
-    Element* e = pending.back();
-    pending.pop_back();
-    all.push_back(e);
-    for (std::size_t i = e->elementCount(); i > 0; --i) pending.push_back(e->ElementAt(i - 1));
+// Most content has no images; then there is no need to walk it for them.
+bool MayHoldImages(std::u16string_view html) {
+  for (std::size_t at = html.find(u'<'); at != std::u16string_view::npos && at + 3 < html.size();
+       at = html.find(u'<', at + 1)) {
+    if ((html[at + 1] | 0x20) == u'i' && (html[at + 2] | 0x20) == u'm' && (html[at + 3] | 0x20) == u'g') return true;
   }
-  return all;
+  return false;
 }
 
 }  // namespace
@@ -98,10 +95,10 @@ void Window::ElementsLeaving(Element& subtree) {
   popups_.erase(std::remove_if(popups_.begin(), popups_.end(),
                                [&](const Popup& p) { return p.popup.get() == &subtree || subtree.IsAncestorOf(p.popup.get()); }),
                 popups_.end());
-  for (Element* element : ElementsOf(subtree)) {
-    dispatcher_->DetachAll(*element, false);
+  for (Element* element = &subtree; element; element = dom::NextElementInOrder(element, &subtree)) {
+    if (dom::RareData* rare = element->rareIfAny(); rare && !rare->handlers.empty()) dispatcher_->DetachAll(*element, false);
     // Behaviors come back with a fresh style if a held element returns to the document.
-    if (element->style() && !css::BehaviorNames(*element->style()).empty()) element->SetStyle(nullptr);
+    if (element->style() && element->style()->behaviors) element->SetStyle(nullptr);
   }
   if (document_->root()) dispatcher_->DropTimersOutside(*document_->root());
 }
@@ -117,7 +114,7 @@ void Window::Update() {
     // Behaviors that draw or animate learn when their container is shown or hidden.
     for (int shown = 0; shown < 2; ++shown) {
       for (const Ref<Element>& container : shown ? changes.shown : changes.hidden) {
-        for (Element* element : ElementsOf(*container)) {
+        for (Element* element = container.get(); element; element = dom::NextElementInOrder(element, container.get())) {
           const dom::RareData* rare = element->rareIfAny();
           if (!rare || rare->handlers.empty()) continue;
           events::BehaviorEventParams params{events::kVisualStatusChanged, element, container.get(),
@@ -146,18 +143,23 @@ bool Window::SetElementHtml(Element& element, std::u16string_view html, unsigned
   if (where > 5) return false;
   auto nodes = parse::ParseFragment(html, where >= 3 ? parent->tag() : element.tag());
   Ref<Element> hold(&element);
+  if (MayHoldImages(html)) {
+    for (auto& node : nodes) {
+      if (Element* added = dom::AsElement(node.get())) RequestImages(*added);
+    }
+  }
   switch (where) {
     case 0:
       for (Ref<dom::Node>& old : element.RemoveAllChildren()) {
         if (Element* gone = dom::AsElement(old.get())) ElementsLeaving(*gone);
       }
-      for (auto& node : nodes) element.AppendChild(node);
+      element.AppendChildren(nodes);
       break;
     case 1:
       for (std::size_t i = 0; i < nodes.size(); ++i) element.InsertNodeAt(i, nodes[i]);
       break;
     case 2:
-      for (auto& node : nodes) element.AppendChild(node);
+      element.AppendChildren(nodes);
       break;
     default: {
       std::size_t at = element.nodeIndex() + (where == 5 ? 1 : 0);
@@ -165,9 +167,6 @@ bool Window::SetElementHtml(Element& element, std::u16string_view html, unsigned
       if (where == 3) Detach(element);
       break;
     }
-  }
-  for (auto& node : nodes) {
-    if (Element* added = dom::AsElement(node.get())) RequestImages(*added);
   }
   Update();
   return true;

@@ -1,6 +1,7 @@
 #include "html/parse/html_parser.h"
 
 #include <algorithm>
+#include <array>
 #include <initializer_list>
 
 #include "base/text.h"
@@ -41,7 +42,10 @@ bool StartsBlock(Atom tag) {
 
 class TreeBuilder {
  public:
-  TreeBuilder(std::u16string_view input, Element* container) : in_(input) { stack_.push_back(container); }
+  TreeBuilder(std::u16string_view input, Element* container) : in_(input) {
+    stack_.push_back(container);
+    pending_.emplace_back();
+  }
 
   void Run() {
     while (pos_ < in_.size()) {
@@ -75,9 +79,14 @@ class TreeBuilder {
         pos_ += (pos_ + 1 < in_.size() && in_[pos_ + 1] == u'\n') ? 2u : 1u;
         continue;
       }
-      text_.push_back(in_[pos_++]);
+      // Plain text up to the next markup, reference or line end goes over in one piece.
+      std::size_t end = pos_ + 1;
+      while (end < in_.size() && in_[end] != u'<' && in_[end] != u'&' && in_[end] != u'\r') ++end;
+      text_.append(in_.substr(pos_, end - pos_));
+      pos_ = end;
     }
     FlushText();
+    PopTo(0);
   }
 
   // Attributes of an `<html>` tag in a full page go to the document's root.
@@ -86,10 +95,45 @@ class TreeBuilder {
  private:
   Element* current() const { return stack_.back(); }
 
+  // An open element's children are collected apart and handed over when it closes, in one
+  // piece: one allocation for its child list instead of one per growth step.
+  void Append(dom::Ref<dom::Node> node) { pending_.back().push_back(std::move(node)); }
+
+  void PopTo(std::size_t depth) {
+    while (stack_.size() > depth) {
+      stack_.back()->AppendChildren(pending_.back());
+      if (stack_.size() == 1) return;  // the container stays, with its children given
+      stack_.pop_back();
+      spare_.push_back(std::move(pending_.back()));
+      pending_.pop_back();
+    }
+  }
+
+  void Push(Element* element) {
+    stack_.push_back(element);
+    if (spare_.empty()) {
+      pending_.emplace_back();
+    } else {
+      pending_.push_back(std::move(spare_.back()));
+      spare_.pop_back();
+    }
+  }
+
+  // Pages repeat a handful of names thousands of times: remember the last few.
+  Atom Name(std::u16string_view name) {
+    if (name.empty()) return dom::InternName(name);
+    auto& slot = names_[(name.size() * 31 + name[0]) % names_.size()];
+    if (slot.second != dom::kAtomNone && slot.first == name) return slot.second;
+    const Atom atom = dom::InternName(name);
+    slot = {std::u16string(name), atom};
+    return atom;
+  }
+
   void FlushText() {
     if (text_.empty()) return;
     const bool blank = std::all_of(text_.begin(), text_.end(), IsSpace);
-    if (!(blank && DropsWhitespace(current()->tag()))) current()->AppendChild(dom::Text::Create(std::move(text_)));
+    // A copy, so that the buffer keeps its room for the next text.
+    if (!(blank && DropsWhitespace(current()->tag()))) Append(dom::Text::Create(text_));
     text_.clear();
   }
 
@@ -167,7 +211,7 @@ class TreeBuilder {
         SkipSpace();
         value = ReadAttributeValue();
       }
-      const Atom atom = dom::InternName(name);
+      const Atom atom = Name(name);
       if (!element.HasAttr(atom)) element.AppendAttrUnchecked(atom, std::move(value));
     }
   }
@@ -178,7 +222,7 @@ class TreeBuilder {
     for (std::size_t i = stack_.size(); i > 1; --i) {
       const Atom tag = stack_[i - 1]->tag();
       if (OneOf(tag, targets)) {
-        stack_.resize(i - 1);
+        PopTo(i - 1);
         return;
       }
       if (OneOf(tag, boundaries)) return;
@@ -200,12 +244,12 @@ class TreeBuilder {
     } else if (tag == kAtomDt || tag == kAtomDd) {
       CloseOpen({kAtomDt, kAtomDd}, {kAtomDl});
     }
-    if (StartsBlock(tag) && current()->tag() == kAtomP && stack_.size() > 1) stack_.pop_back();
+    if (StartsBlock(tag) && current()->tag() == kAtomP && stack_.size() > 1) PopTo(stack_.size() - 1);
   }
 
   void StartTag() {
     ++pos_;
-    const Atom tag = dom::InternName(ReadName());
+    const Atom tag = Name(ReadName());
     if (tag == dom::kAtomHtml && takeHtmlAttributes) {
       Element* root = stack_.front();
       while (root->parent()) root = root->parent();
@@ -216,13 +260,15 @@ class TreeBuilder {
     Ref<Element> element = Element::Create(tag);
     const bool selfClosed = ReadAttributes(*element);
     Element* raw = element.get();
-    current()->AppendChild(std::move(element));
-    if (selfClosed || IsVoidElement(tag)) return;
-    if (IsRawTextElement(tag)) {
+    if (IsRawTextElement(tag) && !selfClosed) {
       ReadRawText(*raw);
+      // Scripts are never run; they are not kept either.
+      if (tag != dom::kAtomScript) Append(std::move(element));
       return;
     }
-    if (stack_.size() <= kMaxDepth) stack_.push_back(raw);
+    Append(std::move(element));
+    if (selfClosed || IsVoidElement(tag)) return;
+    if (stack_.size() <= kMaxDepth) Push(raw);
   }
 
   void ReadRawText(Element& element) {
@@ -242,11 +288,6 @@ class TreeBuilder {
     if (pos_ < in_.size()) {
       const std::size_t close = in_.find(u'>', pos_);
       pos_ = close == std::u16string_view::npos ? in_.size() : close + 1;
-    }
-    if (element.tag() == dom::kAtomScript) {
-      // Scripts are never run; they are not kept either.
-      element.parent()->RemoveChild(&element);
-      return;
     }
     if (element.tag() == dom::kAtomTextarea || element.tag() == dom::kAtomTitle) {
       std::u16string decoded;
@@ -269,7 +310,7 @@ class TreeBuilder {
     if (tag == dom::kAtomNone) return;
     for (std::size_t i = stack_.size(); i > 1; --i) {
       if (stack_[i - 1]->tag() == tag) {
-        stack_.resize(i - 1);
+        PopTo(i - 1);
         return;
       }
     }
@@ -280,6 +321,9 @@ class TreeBuilder {
   std::size_t pos_ = 0;
   std::u16string text_;
   std::vector<Element*> stack_;
+  std::vector<std::vector<dom::Ref<dom::Node>>> pending_;  // children of each open element so far
+  std::vector<std::vector<dom::Ref<dom::Node>>> spare_;    // emptied lists, kept for their room
+  std::array<std::pair<std::u16string, Atom>, 16> names_{};
 };
 
 }  // namespace

@@ -51,7 +51,7 @@ void AppendContent(const dom::Element& element, std::u16string& out) {
     pending.pop_back();
     if (!step.node->IsElement()) {
       const dom::Element* parent = step.node->parent();
-      const auto& text = static_cast<const dom::Text*>(step.node)->text();
+      const std::u16string_view text = static_cast<const dom::Text*>(step.node)->text();
       if (parent && (parent->tag() == dom::kAtomStyle || parent->tag() == dom::kAtomScript)) {
         out += text;
       } else {
