@@ -62,7 +62,8 @@ std::intptr_t Window::Notify(NotificationHeader& header) {
 }
 
 void Window::AttachBehaviors(Element& element) {
-  if (element.document() != document_.get()) return;
+  // An element that left the document while behaviors were being attached lost its style there.
+  if (!element.style()) return;
   const std::vector<std::string> names = element.style() ? css::BehaviorNames(*element.style()) : std::vector<std::string>{};
   if (dom::RareData* rare = element.rareIfAny()) {
     std::vector<dom::AttachedHandler> gone;

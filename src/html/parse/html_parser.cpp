@@ -119,13 +119,14 @@ class TreeBuilder {
     }
   }
 
-  // Pages repeat a handful of names thousands of times: remember the last few.
-  Atom Name(std::u16string_view name) {
+  // Pages repeat a handful of names thousands of times: remember the last few. End tags only
+  // look names up, so that stray ones never grow the table.
+  Atom Name(std::u16string_view name, bool intern = true) {
     if (name.empty()) return dom::InternName(name);
     auto& slot = names_[(name.size() * 31 + name[0]) % names_.size()];
     if (slot.second != dom::kAtomNone && slot.first == name) return slot.second;
-    const Atom atom = dom::InternName(name);
-    slot = {std::u16string(name), atom};
+    const Atom atom = intern ? dom::InternName(name) : dom::FindName(name);
+    if (atom != dom::kAtomNone) slot = {std::u16string(name), atom};
     return atom;
   }
 
@@ -306,7 +307,7 @@ class TreeBuilder {
     const std::u16string_view name = ReadName();
     const std::size_t close = in_.find(u'>', pos_);
     pos_ = close == std::u16string_view::npos ? in_.size() : close + 1;
-    const Atom tag = dom::FindName(name);
+    const Atom tag = Name(name, false);
     if (tag == dom::kAtomNone) return;
     for (std::size_t i = stack_.size(); i > 1; --i) {
       if (stack_[i - 1]->tag() == tag) {
