@@ -191,6 +191,16 @@ TEST_F(ApiTest, ProgramStylesAndStatesChangeTheComputedStyle) {
   HTMLayoutSetStyleAttribute(box, "visibility", u"visible");
   HTMLayoutIsElementVisible(Find("#first"), &visible);
   EXPECT_TRUE(visible);
+  HTMLayoutSetStyleAttribute(box, "visibility", nullptr);
+  HTMLayoutGetStyleAttribute(box, "visibility", &value);
+  EXPECT_EQ(value, u"visible");  // computed now: the program's value is gone
+  HTMLayoutSetStyleAttribute(box, "width", u"200px");
+  HTMLayoutGetStyleAttribute(Find("#first"), "width", &value);
+  EXPECT_EQ(value, u"auto");
+  HTMLayoutGetStyleAttribute(box, "flow", &value);
+  EXPECT_EQ(value, u"default");
+  HTMLayoutGetStyleAttribute(box, "color", &value);
+  EXPECT_EQ(value, std::nullopt);
   const int before = host_.immediateUpdates();
   HTMLayoutSetElementState(box, dom::kStateChecked | dom::kStateCurrent, 0, true);
   HTMLayoutUpdateElement(box, true);

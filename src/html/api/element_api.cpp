@@ -109,11 +109,14 @@ DomResult HTMLayoutGetStyleAttribute(HELEMENT he, const char* name, std::optiona
   if (he == nullptr) return DomResult::kInvalidHandle;
   if (name == nullptr || value == nullptr) return DomResult::kInvalidParameter;
   *value = std::nullopt;
+  const std::u16string property = AsciiToUtf16(name);
   if (const dom::RareData* rare = he->rareIfAny()) {
-    for (const auto& [property, text] : rare->runtimeStyle) {
-      if (EqualsIgnoringAsciiCase(property, AsciiToUtf16(name))) *value = text;
+    for (const auto& [own, text] : rare->runtimeStyle) {
+      if (EqualsIgnoringAsciiCase(own, property)) *value = text;
     }
   }
+  // Without a value of the program's own, the computed one (the splitter reads `flow` and sizes).
+  if (!*value && he->style()) *value = css::ComputedValueText(*he->style(), property);
   return DomResult::kOk;
 }
 

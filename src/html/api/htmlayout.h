@@ -102,7 +102,8 @@ DomResult HTMLayoutGetAttributeByName(HELEMENT he, const char* name, std::option
 DomResult HTMLayoutSetAttributeByName(HELEMENT he, const char* name, const char16_t* value);
 DomResult HTMLayoutGetAttributeCount(HELEMENT he, unsigned* count);
 DomResult HTMLayoutGetNthAttribute(HELEMENT he, unsigned n, std::string* name, std::u16string* value);
-// Styles the program sets win over every style sheet; a null value removes the setting.
+// Styles the program sets win over every style sheet; a null value removes the setting. Reading
+// answers the program's value, or else the computed one for the properties behaviors read.
 DomResult HTMLayoutGetStyleAttribute(HELEMENT he, const char* name, std::optional<std::u16string>* value);
 DomResult HTMLayoutSetStyleAttribute(HELEMENT he, const char* name, const char16_t* value);
 DomResult HTMLayoutGetElementState(HELEMENT he, unsigned* state);

@@ -2,6 +2,8 @@
 
 #include <cstdint>
 #include <memory>
+#include <optional>
+#include <string_view>
 #include <string>
 #include <vector>
 
@@ -101,5 +103,9 @@ struct ComputedStyle {
 };
 
 const std::vector<std::string>& BehaviorNames(const ComputedStyle& style);
+
+// The computed value of a property as CSS text ("200px", "50%", "1*", "auto", "hidden",
+// "horizontal" ...), for the properties behaviors read back; none for the others.
+std::optional<std::u16string> ComputedValueText(const ComputedStyle& style, std::u16string_view property);
 
 }  // namespace kestrune::html::css
