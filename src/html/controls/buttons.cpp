@@ -63,16 +63,22 @@ class Button final : public PressControl {
   void Click(Element& element, unsigned reason) override { Post(element, kButtonClick, element, reason); }
 };
 
-class CheckBox final : public PressControl {
+// Check boxes and radio buttons: checked from the `checked` attribute, their value is the state.
+class Toggle : public PressControl {
  public:
   using PressControl::PressControl;
-  unsigned Type(const Element&) const override { return kCtlCheckbox; }
   void Attached(Element& element) override {
     if (element.HasAttr(dom::kAtomChecked)) element.SetState(element.state() | dom::kStateChecked);
   }
   ControlValue GetValue(const Element& element) const override {
     return ControlValue::Bool((element.state() & dom::kStateChecked) != 0);
   }
+};
+
+class CheckBox final : public Toggle {
+ public:
+  using Toggle::Toggle;
+  unsigned Type(const Element&) const override { return kCtlCheckbox; }
   bool SetValue(Element& element, const ControlValue& value) override {
     if (value.kind != ControlValue::Kind::kBool) return false;
     element.SetState(value.boolean ? element.state() | dom::kStateChecked : element.state() & ~dom::kStateChecked);
@@ -87,16 +93,10 @@ class CheckBox final : public PressControl {
 };
 
 // Radio buttons of one name form a group within the nearest form (or the whole document).
-class Radio final : public PressControl {
+class Radio final : public Toggle {
  public:
-  using PressControl::PressControl;
+  using Toggle::Toggle;
   unsigned Type(const Element&) const override { return kCtlRadio; }
-  void Attached(Element& element) override {
-    if (element.HasAttr(dom::kAtomChecked)) element.SetState(element.state() | dom::kStateChecked);
-  }
-  ControlValue GetValue(const Element& element) const override {
-    return ControlValue::Bool((element.state() & dom::kStateChecked) != 0);
-  }
   bool SetValue(Element& element, const ControlValue& value) override {
     if (value.kind != ControlValue::Kind::kBool) return false;
     if (value.boolean) Check(element);

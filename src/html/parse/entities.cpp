@@ -1,5 +1,7 @@
 #include "html/parse/entities.h"
 
+#include "base/utf.h"
+
 namespace kestrune::html::parse {
 namespace {
 
@@ -68,13 +70,7 @@ std::size_t DecodeNumeric(std::u16string_view text, std::size_t at, std::u16stri
 
 void AppendCodePoint(char32_t code, std::u16string& out) {
   if (code == 0 || code > 0x10FFFF || (code >= 0xD800 && code <= 0xDFFF)) code = 0xFFFD;
-  if (code < 0x10000) {
-    out.push_back(static_cast<char16_t>(code));
-  } else {
-    code -= 0x10000;
-    out.push_back(static_cast<char16_t>(0xD800 + (code >> 10)));
-    out.push_back(static_cast<char16_t>(0xDC00 + (code & 0x3FF)));
-  }
+  AppendUtf16(out, code);
 }
 
 std::size_t DecodeCharacterReference(std::u16string_view text, std::size_t at, std::u16string& out) {
