@@ -32,6 +32,9 @@ class ElementHandleTest : public ::testing::Test {
 TEST_F(ElementHandleTest, HoldsOneEngineReferencePerHandle) {
   ElementHandle status = root_.FindById(u"Status");
   ASSERT_TRUE(status);
+  EXPECT_TRUE(status.Is(status.get()));
+  EXPECT_FALSE(status.Is(root_.get()));
+  EXPECT_FALSE(ElementHandle().Is(nullptr));
   const auto references = [&] { return status.get()->refCount(); };
   EXPECT_EQ(references(), 2u);  // the tree's and this handle's
   {

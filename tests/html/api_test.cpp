@@ -202,7 +202,9 @@ TEST_F(ApiTest, ProgramStylesAndStatesChangeTheComputedStyle) {
   HTMLayoutGetStyleAttribute(box, "color", &value);
   EXPECT_EQ(value, std::nullopt);
   const int before = host_.immediateUpdates();
+  const int invalidated = host_.invalidations();
   HTMLayoutSetElementState(box, dom::kStateChecked | dom::kStateCurrent, 0, true);
+  EXPECT_GT(host_.invalidations(), invalidated);
   HTMLayoutUpdateElement(box, true);
   EXPECT_EQ(State(box), dom::kStateChecked | dom::kStateCurrent);
   EXPECT_EQ(host_.immediateUpdates(), before + 2);  // both ask for it

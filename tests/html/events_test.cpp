@@ -122,10 +122,13 @@ struct Ticker {
 TEST_F(EventsTest, TimersTickUntilTheirHandlerDeclinesOrTheElementLeaves) {
   Ticker ticker;
   HTMLayoutAttachEventHandlerEx(inner_, &Ticker::Proc, &ticker, events::kHandleTimer);
+  EXPECT_EQ(HTMLayoutRunPending(window_), -1);  // no timer yet
   HTMLayoutSetTimer(inner_, 10);
   auto now = events::Clock::now();
-  window_->RunPending(now);
+  const auto untilDue = window_->RunPending(now);
   EXPECT_EQ(ticker.ticks, 0);  // not due yet
+  ASSERT_TRUE(untilDue.has_value());
+  EXPECT_LE(*untilDue, std::chrono::milliseconds(10));
   for (int i = 1; i <= 5; ++i) window_->RunPending(now + std::chrono::milliseconds(20 * i));
   EXPECT_EQ(ticker.ticks, 3);
 

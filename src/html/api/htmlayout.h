@@ -66,8 +66,9 @@ DomResult HTMLayoutWindowDetachEventHandler(HLWINDOW window, ElementEventProc pr
 // Platform-neutral input, the one entry the window hosts call.
 bool HTMLayoutMouseInput(HLWINDOW window, const events::MouseInput& input);
 bool HTMLayoutKeyInput(HLWINDOW window, const events::KeyInput& input);
-// The host calls this on the UI thread when woken (queued calls, posted events, timers).
-void HTMLayoutRunPending(HLWINDOW window);
+// The host calls this on the UI thread when woken (queued calls, posted events, timers); the
+// answer is the number of milliseconds until the next timer is due, -1 when none runs.
+int HTMLayoutRunPending(HLWINDOW window);
 // From a worker thread: runs the call on the UI thread and waits for it.
 void HTMLayoutRunOnUiThread(HLWINDOW window, const std::function<void()>& call);
 // The layout engine's geometry for the window (none: "no geometry").

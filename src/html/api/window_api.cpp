@@ -1,9 +1,9 @@
+#include <chrono>
 #include <map>
 #include <memory>
 #include <vector>
 
 #include "html/api/registry.h"
-#include "base/utf.h"
 
 namespace kestrune::html {
 
@@ -101,8 +101,11 @@ bool HTMLayoutKeyInput(HLWINDOW window, const events::KeyInput& input) {
   return handled;
 }
 
-void HTMLayoutRunPending(HLWINDOW window) {
-  if (window) window->RunPending();
+int HTMLayoutRunPending(HLWINDOW window) {
+  if (window == nullptr) return -1;
+  const auto next = window->RunPending();
+  if (!next) return -1;
+  return static_cast<int>(std::chrono::ceil<std::chrono::milliseconds>(*next).count());
 }
 
 void HTMLayoutRunOnUiThread(HLWINDOW window, const std::function<void()>& call) {

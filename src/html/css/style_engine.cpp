@@ -61,9 +61,9 @@ bool IsShown(const ComputedStyle& style) {
 }
 
 std::size_t StyleEngine::KeyHash::operator()(const std::vector<std::uintptr_t>& key) const {
-  std::size_t hash = 1469598103934665603ull;
+  std::uint64_t hash = 1469598103934665603ull;
   for (std::uintptr_t part : key) hash = (hash ^ part) * 1099511628211ull;
-  return hash;
+  return static_cast<std::size_t>(hash ^ (hash >> 32));
 }
 
 StyleEngine::StyleEngine(dom::Document& document) : document_(document), master_(MasterSheet()) { Reindex(); }
@@ -170,7 +170,9 @@ std::uint32_t StyleEngine::ChainOf(const dom::Element& element, std::uint32_t pa
   for (std::size_t i = 0; i < structural_.size(); ++i) {
     if (parent && MatchesPseudo(structural_[i].pseudo, element)) bits |= std::uint64_t{1} << i;
   }
-  signature_.push_back(static_cast<std::uintptr_t>(bits));
+  // Both halves: a pointer-sized word may hold only 32 of the bits.
+  signature_.push_back(static_cast<std::uintptr_t>(bits & 0xFFFFFFFFu));
+  signature_.push_back(static_cast<std::uintptr_t>(bits >> 32));
   for (dom::Atom atom : features.attributes) {
     const std::u16string* value = element.Attr(atom);
     if (value == nullptr) {

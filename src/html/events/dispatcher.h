@@ -45,7 +45,6 @@ class EventDispatcher {
   void PostTask(std::function<void()> task);
   // Runs what was posted, in order, including what those events post in turn.
   void RunPosted();
-  bool HasPosted() const { return !posted_.empty(); }
 
   // A wake-up request for the host: something was posted or a timer changed while no event
   // was in progress.

@@ -18,7 +18,6 @@ class HeadlessHost final : public WindowHost {
   void Invalidate(const Rect*) override { ++invalidations_; }
   void UpdateNow() override { ++immediateUpdates_; }
   void RequestWakeUp() override;
-  void SetCursor(unsigned cursorType) override { cursor_ = cursorType; }
   std::u16string ClipboardText() override { return clipboard_; }
   void SetClipboardText(const std::u16string& text) override { clipboard_ = text; }
 
@@ -28,12 +27,10 @@ class HeadlessHost final : public WindowHost {
 
   int invalidations() const { return invalidations_; }
   int immediateUpdates() const { return immediateUpdates_; }
-  unsigned cursor() const { return cursor_; }
 
  private:
   int invalidations_ = 0;
   int immediateUpdates_ = 0;
-  unsigned cursor_ = 0;
   std::u16string clipboard_;
   std::mutex mutex_;
   std::condition_variable woken_;

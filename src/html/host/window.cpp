@@ -227,10 +227,6 @@ Element* Window::HidePopupHolding(Element& element) {
   return nullptr;
 }
 
-bool Window::IsPopupShown(const Element& popup) const {
-  return std::any_of(popups_.begin(), popups_.end(), [&](const Popup& p) { return p.popup.get() == &popup; });
-}
-
 void Window::HttpRequest(Element& initiator, std::u16string url, unsigned dataType, bool post,
                          std::vector<std::pair<std::u16string, std::u16string>> parameters, Element* into) {
   if (!http_) http_ = platform::MakeSystemHttpClient();
@@ -275,12 +271,15 @@ void Window::DeliverData(Ref<Element> initiator, Ref<Element> into, std::u16stri
   Update();
 }
 
-void Window::RunPending(events::Clock::time_point now) {
+std::optional<events::Clock::duration> Window::RunPending(events::Clock::time_point now) {
   uiThread_->RunQueued();
   JoinFinishedWorkers();
   dispatcher_->RunPosted();
   dispatcher_->RunDueTimers(now);
   Update();
+  const auto next = dispatcher_->NextTimer();
+  if (!next) return std::nullopt;
+  return std::max(events::Clock::duration::zero(), *next - now);
 }
 
 }  // namespace kestrune::html::host

@@ -66,7 +66,6 @@ class Window final : public controls::ControlHost {
   bool ShowPopup(dom::Element& popup, dom::Element* anchor, Point at, unsigned placement);
   bool HidePopup(dom::Element& popup);
   dom::Element* HidePopupHolding(dom::Element& element) override;
-  bool IsPopupShown(const dom::Element& popup) const;
 
   // HTTP: the answer arrives as a data-arrived event (group 0x80) at the initiator, on the UI
   // thread. With `into`, HTML that no handler takes becomes that element's content.
@@ -74,8 +73,9 @@ class Window final : public controls::ControlHost {
                    std::vector<std::pair<std::u16string, std::u16string>> parameters, dom::Element* into = nullptr);
 
   // The platform host calls this on the UI thread when woken: queued calls, posted events,
-  // due timers, then the document is brought up to date.
-  void RunPending(events::Clock::time_point now = events::Clock::now());
+  // due timers, then the document is brought up to date. Answers how long until the next timer
+  // is due (the host wakes the window again then), or none when no timer runs.
+  std::optional<events::Clock::duration> RunPending(events::Clock::time_point now = events::Clock::now());
 
   std::u16string ClipboardText() override { return host_.ClipboardText(); }
   void SetClipboardText(const std::u16string& text) override { host_.SetClipboardText(text); }

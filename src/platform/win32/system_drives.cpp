@@ -22,7 +22,7 @@ class WindowsDrives : public Drives {
     std::vector<wchar_t> buffer(needed, L'\0');
     const DWORD written = GetLogicalDriveStringsW(needed, buffer.data());
     if (written == 0 || written > needed) return list + u'\0';
-    list.append(buffer.begin(), buffer.begin() + written);
+    list.append(buffer.begin(), buffer.begin() + static_cast<std::ptrdiff_t>(written));
     list += u'\0';
     return list;
   }
