@@ -34,7 +34,7 @@ void* AllocateNode(std::size_t size) { return NodeMemory().allocate(size, aligno
 void FreeNode(void* memory, std::size_t size) { NodeMemory().deallocate(memory, size, alignof(std::max_align_t)); }
 #else
 void* AllocateNode(std::size_t size) { return ::operator new(size); }
-void FreeNode(void* memory, std::size_t size) { ::operator delete(memory, size); }
+void FreeNode(void* memory, std::size_t) { ::operator delete(memory); }
 #endif
 
 bool Contains(const std::vector<Atom>& atoms, Atom atom) {
