@@ -120,6 +120,15 @@ TEST_F(SelectorTest, MatchesEveryStatePseudoClass) {
   EXPECT_TRUE(Match(u"ul li:checked + li", u"l3"));
 }
 
+// Found by fuzzing: a number too big for any integer as an attribute value.
+TEST_F(SelectorTest, TakesNumbersAsAttributeValuesAsWritten) {
+  const std::u16string huge(70, u'3');
+  ById(u"box")->SetAttr(dom::InternName("data-n"), huge + u"4");
+  EXPECT_TRUE(Match(u"[data-n^=" + huge + u"]", u"box"));
+  EXPECT_TRUE(Match(u"[data-n$=34]", u"box"));
+  EXPECT_FALSE(ParseSelectorList(u"li:nth-child(" + huge + u"n+1)").has_value());
+}
+
 TEST_F(SelectorTest, RejectsInvalidSelectors) {
   const char16_t* invalid[] = {u"", u"a >", u"> a", u"[x=]", u"[=x]", u"a:unknown", u"a::before", u"a:not()",
                                u"li:nth-child(x)", u"a,", u"#", u".", u"[x", u"a:not(:not(:not(:not(:not(b)))))"};

@@ -79,7 +79,7 @@ int Hex(char16_t c) {
 }
 
 std::uint32_t Channel(double value) {
-  return static_cast<std::uint32_t>(std::clamp(std::lround(value), 0L, 255L));
+  return static_cast<std::uint32_t>(std::lround(std::clamp(value, 0.0, 255.0)));
 }
 
 std::optional<Color> ColorFromHash(std::u16string_view hex) {
@@ -115,26 +115,29 @@ std::optional<Color> ColorFromFunction(const std::vector<Token>& value) {
   return (a << 24) | (Channel(parts[0]) << 16) | (Channel(parts[1]) << 8) | Channel(parts[2]);
 }
 
+// Lengths compound through em from parent to child; kept in a range a float holds.
+float Float(double value) { return static_cast<float>(std::clamp(value, -1e30, 1e30)); }
+
 // A length; em against `emBase`; a bare 0 is 0 px.
 std::optional<Length> ToLength(const Token& token, float emBase, bool allowAuto = true) {
   switch (token.type) {
     case Type::kNumber:
       if (token.number == 0) return Length::Px(0);
-      return Length::Px(static_cast<float>(token.number));  // unitless pixels, as old pages write them
-    case Type::kPercentage: return Length{static_cast<float>(token.number), Length::Unit::kPercent};
-    case Type::kFlex: return Length{static_cast<float>(token.number), Length::Unit::kFlex};
+      return Length::Px(Float(token.number));  // unitless pixels, as old pages write them
+    case Type::kPercentage: return Length{Float(token.number), Length::Unit::kPercent};
+    case Type::kFlex: return Length{Float(token.number), Length::Unit::kFlex};
     case Type::kDimension: {
       const double n = token.number;
       const std::u16string& unit = token.text;
-      if (EqualsIgnoringAsciiCase(unit, u"px")) return Length::Px(static_cast<float>(n));
-      if (EqualsIgnoringAsciiCase(unit, u"em")) return Length::Px(static_cast<float>(n * emBase));
-      if (EqualsIgnoringAsciiCase(unit, u"ex")) return Length::Px(static_cast<float>(n * emBase / 2));
-      if (EqualsIgnoringAsciiCase(unit, u"pt")) return Length::Px(static_cast<float>(n * 4 / 3));
-      if (EqualsIgnoringAsciiCase(unit, u"pc")) return Length::Px(static_cast<float>(n * 16));
-      if (EqualsIgnoringAsciiCase(unit, u"in")) return Length::Px(static_cast<float>(n * 96));
-      if (EqualsIgnoringAsciiCase(unit, u"cm")) return Length::Px(static_cast<float>(n * 96 / 2.54));
-      if (EqualsIgnoringAsciiCase(unit, u"mm")) return Length::Px(static_cast<float>(n * 96 / 25.4));
-      if (EqualsIgnoringAsciiCase(unit, u"dip")) return Length::Px(static_cast<float>(n));
+      if (EqualsIgnoringAsciiCase(unit, u"px")) return Length::Px(Float(n));
+      if (EqualsIgnoringAsciiCase(unit, u"em")) return Length::Px(Float(n * emBase));
+      if (EqualsIgnoringAsciiCase(unit, u"ex")) return Length::Px(Float(n * emBase / 2));
+      if (EqualsIgnoringAsciiCase(unit, u"pt")) return Length::Px(Float(n * 4 / 3));
+      if (EqualsIgnoringAsciiCase(unit, u"pc")) return Length::Px(Float(n * 16));
+      if (EqualsIgnoringAsciiCase(unit, u"in")) return Length::Px(Float(n * 96));
+      if (EqualsIgnoringAsciiCase(unit, u"cm")) return Length::Px(Float(n * 96 / 2.54));
+      if (EqualsIgnoringAsciiCase(unit, u"mm")) return Length::Px(Float(n * 96 / 25.4));
+      if (EqualsIgnoringAsciiCase(unit, u"dip")) return Length::Px(Float(n));
       return std::nullopt;
     }
     case Type::kDelim:
@@ -417,7 +420,7 @@ void ApplyDeclaration(const Declaration& declaration, ComputedStyle& style, cons
       if (IsKeyword(v, u"normal")) {
         style.lineHeight = Length::Auto();
       } else if (v.size() == 1 && v[0].Is(Type::kNumber)) {
-        style.lineHeight = Length::Px(static_cast<float>(v[0].number) * em);  // a factor of the font size
+        style.lineHeight = Length::Px(Float(v[0].number * em));  // a factor of the font size
       } else if (auto length = SingleLength(v, em)) {
         if (length->unit == Length::Unit::kPercent) *length = Length::Px(length->value * em / 100);
         style.lineHeight = *length;

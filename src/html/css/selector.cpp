@@ -187,7 +187,7 @@ class SelectorParser {
     if (Peek().Is(Type::kString) || Peek().Is(Type::kIdent)) {
       test.value = Peek().text;
     } else if (Peek().Is(Type::kNumber)) {
-      test.value = FormatDecimal(static_cast<std::int64_t>(Peek().number));
+      test.value = Peek().text;
     } else {
       return std::nullopt;
     }
@@ -272,10 +272,10 @@ class SelectorParser {
         case Type::kNumber:
         case Type::kDimension: {
           const double number = token.number;
-          if (number != static_cast<int>(number) || number > 1e6 || number < -1e6) return false;
+          if (number > 1e6 || number < -1e6 || number != static_cast<int>(number)) return false;
           if (number >= 0 && !text.empty() && text.back() != u'+' && text.back() != u'-') text.push_back(u'+');
           text += FormatDecimal(static_cast<std::int64_t>(number));
-          text += Lower(token.text);
+          if (token.type == Type::kDimension) text += Lower(token.text);
           break;
         }
         default: return false;

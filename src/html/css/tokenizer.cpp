@@ -1,5 +1,6 @@
 #include "html/css/tokenizer.h"
 
+#include <algorithm>
 #include <cmath>
 
 #include "html/parse/entities.h"
@@ -19,6 +20,8 @@ int HexValue(char16_t c) {
   if (c >= u'A' && c <= u'F') return c - u'A' + 10;
   return -1;
 }
+
+constexpr double kNumberLimit = 1e7;
 
 class Tokenizer {
  public:
@@ -142,7 +145,9 @@ class Tokenizer {
   }
 
   void ReadNumeric(Token& token) {
-    token.number = ReadNumber();
+    const std::size_t start = pos_;
+    // No length or count of a page needs more; the bound keeps every later conversion defined.
+    token.number = std::clamp(ReadNumber(), -kNumberLimit, kNumberLimit);
     if (StartsName(0)) {
       token.type = Token::Type::kDimension;
       token.text = ReadName();
@@ -154,6 +159,7 @@ class Tokenizer {
       token.type = Token::Type::kFlex;
     } else {
       token.type = Token::Type::kNumber;
+      token.text = std::u16string(in_.substr(start, pos_ - start));  // as written, for attribute values
     }
   }
 

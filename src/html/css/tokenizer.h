@@ -14,7 +14,7 @@ struct Token {
     kRightParen, kLeftBrace, kRightBrace,
   };
   Type type = Type::kDelim;
-  std::u16string text;  // name, string or URL content, hash name, dimension unit
+  std::u16string text;  // name, string or URL content, hash name, dimension unit, a number as written
   double number = 0;
   char16_t delim = 0;
 
