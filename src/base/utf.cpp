@@ -28,6 +28,8 @@ void AppendUtf8(std::string& out, char32_t codePoint) {
   }
 }
 
+}  // namespace
+
 void AppendUtf16(std::u16string& out, char32_t codePoint) {
   if (codePoint < 0x10000) {
     out.push_back(static_cast<char16_t>(codePoint));
@@ -37,8 +39,6 @@ void AppendUtf16(std::u16string& out, char32_t codePoint) {
     out.push_back(static_cast<char16_t>(0xDC00 + (codePoint & 0x3FF)));
   }
 }
-
-}  // namespace
 
 std::string EncodeUtf8(std::u16string_view text) {
   std::string out;

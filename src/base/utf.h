@@ -15,6 +15,9 @@ std::string EncodeUtf8(std::u16string_view text);
 // U+10FFFF) becomes one U+FFFD per offending byte.
 std::u16string DecodeUtf8(std::string_view bytes);
 
+// Appends a code point (at most U+10FFFF) as one UTF-16 unit or a surrogate pair.
+void AppendUtf16(std::u16string& out, char32_t codePoint);
+
 // Appends UTF-16LE bytes (no terminator) as UTF-16 code units; an odd last byte is ignored.
 std::u16string DecodeUtf16Le(const unsigned char* bytes, std::size_t byteCount);
 

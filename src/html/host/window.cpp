@@ -1,0 +1,285 @@
+#include "html/host/window.h"
+
+#include <algorithm>
+
+#include "base/utf.h"
+#include "html/dom/states.h"
+#include "html/host/url.h"
+#include "html/parse/html_parser.h"
+
+namespace kestrune::html::host {
+
+using dom::Element;
+using dom::Ref;
+
+namespace {
+
+// Rounds of restyling in one Update: attaching a behavior may change the document again, but
+// a page that keeps doing so must not hang the window.
+constexpr int kMaxUpdateRounds = 8;
+
+// Most content has no images; then there is no need to walk it for them.
+bool MayHoldImages(std::u16string_view html) {
+  for (std::size_t at = html.find(u'<'); at != std::u16string_view::npos && at + 3 < html.size();
+       at = html.find(u'<', at + 1)) {
+    if ((html[at + 1] | 0x20) == u'i' && (html[at + 2] | 0x20) == u'm' && (html[at + 3] | 0x20) == u'g') return true;
+  }
+  return false;
+}
+
+}  // namespace
+
+Window::Window(WindowHost& host)
+    : host_(host),
+      document_(std::make_unique<dom::Document>()),
+      styles_(std::make_unique<css::StyleEngine>(*document_)),
+      dispatcher_(std::make_unique<events::EventDispatcher>(*document_)),
+      input_(std::make_unique<events::InputRouter>(*dispatcher_, noGeometry_)),
+      uiThread_(std::make_shared<UiThreadQueue>([&host] { host.RequestWakeUp(); })) {
+  dispatcher_->SetWakeUp([this] { host_.RequestWakeUp(); });
+  Update();
+}
+
+Window::~Window() {
+  for (Worker& worker : workers_) worker.thread.join();
+  if (document_->root()) ElementsLeaving(*document_->root());
+}
+
+void Window::SetCallback(NotificationCallback callback, void* context) {
+  callback_ = callback;
+  callbackContext_ = context;
+}
+
+void Window::SetGeometry(events::GeometrySource* geometry) {
+  geometry_ = geometry ? geometry : &noGeometry_;
+  input_->SetGeometry(*geometry_);
+}
+
+std::intptr_t Window::Notify(NotificationHeader& header) {
+  if (callback_ == nullptr) return 0;
+  header.window = this;
+  return callback_(kWmNotify, 0, reinterpret_cast<std::intptr_t>(&header), callbackContext_);
+}
+
+void Window::AttachBehaviors(Element& element) {
+  // An element that left the document while behaviors were being attached lost its style there.
+  if (!element.style()) return;
+  const std::vector<std::string> names = element.style() ? css::BehaviorNames(*element.style()) : std::vector<std::string>{};
+  if (dom::RareData* rare = element.rareIfAny()) {
+    std::vector<dom::AttachedHandler> gone;
+    for (const dom::AttachedHandler& handler : rare->handlers) {
+      if (!handler.behavior.empty() && std::find(names.begin(), names.end(), handler.behavior) == names.end()) {
+        gone.push_back(handler);
+      }
+    }
+    for (const dom::AttachedHandler& handler : gone) dispatcher_->DetachHandler(element, handler.proc, handler.tag);
+  }
+  for (const std::string& name : names) {
+    const dom::RareData* rare = element.rareIfAny();
+    if (rare && std::any_of(rare->handlers.begin(), rare->handlers.end(),
+                            [&](const dom::AttachedHandler& h) { return h.behavior == name; })) {
+      continue;
+    }
+    // The program's behaviors of a name come first; the engine's own control otherwise.
+    AttachBehaviorNotification notification{{this, 0, kNotifyAttachBehavior}, &element, name.c_str(), nullptr, nullptr, 0};
+    Notify(notification.header);
+    if (notification.elementProc != nullptr) {
+      dispatcher_->AttachHandler(element, {notification.elementProc, notification.elementTag, notification.elementEvents, name});
+    } else if (auto control = controls::MakeBuiltInControl(name, *this)) {
+      controls::AttachControl(element, std::move(control), name, *dispatcher_);
+    }
+  }
+}
+
+void Window::ElementsLeaving(Element& subtree) {
+  input_->ForgetInside(subtree);
+  popups_.erase(std::remove_if(popups_.begin(), popups_.end(),
+                               [&](const Popup& p) { return p.popup.get() == &subtree || subtree.IsAncestorOf(p.popup.get()); }),
+                popups_.end());
+  for (Element* element = &subtree; element; element = dom::NextElementInOrder(element, &subtree)) {
+    if (dom::RareData* rare = element->rareIfAny(); rare && !rare->handlers.empty()) dispatcher_->DetachAll(*element, false);
+    // Behaviors come back with a fresh style if a held element returns to the document.
+    if (element->style() && element->style()->behaviors) element->SetStyle(nullptr);
+  }
+  if (document_->root()) dispatcher_->DropTimersOutside(*document_->root());
+}
+
+void Window::Update() {
+  if (updating_) return;
+  updating_ = true;
+  for (int round = 0; round < kMaxUpdateRounds; ++round) {
+    css::StyleChanges changes;
+    styles_->Update(&changes);
+    if (changes.empty()) break;
+    for (const Ref<Element>& element : changes.behaviors) AttachBehaviors(*element);
+    // Behaviors that draw or animate learn when their container is shown or hidden.
+    for (int shown = 0; shown < 2; ++shown) {
+      for (const Ref<Element>& container : shown ? changes.shown : changes.hidden) {
+        for (Element* element = container.get(); element; element = dom::NextElementInOrder(element, container.get())) {
+          const dom::RareData* rare = element->rareIfAny();
+          if (!rare || rare->handlers.empty()) continue;
+          events::BehaviorEventParams params{events::kVisualStatusChanged, element, container.get(),
+                                             static_cast<std::uintptr_t>(shown)};
+          dispatcher_->DeliverToElement(*element, events::kHandleBehaviorEvent, &params);
+        }
+      }
+    }
+  }
+  updating_ = false;
+  Element* root = document_->root();
+  if (root && (root->dirty() & (dom::kPaintDirty | dom::kChildPaintDirty))) host_.Invalidate(nullptr);
+}
+
+void Window::Redraw(Element* element, bool now) {
+  Update();
+  std::optional<Rect> area;
+  if (element) area = geometry_->Location(*element, events::kViewRelative | events::kBorderBox);
+  host_.Invalidate(area ? &*area : nullptr);
+  if (now) host_.UpdateNow();
+}
+
+bool Window::SetElementHtml(Element& element, std::u16string_view html, unsigned where) {
+  Element* parent = element.parent();
+  if (where >= 3 && parent == nullptr) return false;
+  if (where > 5) return false;
+  auto nodes = parse::ParseFragment(html, where >= 3 ? parent->tag() : element.tag());
+  Ref<Element> hold(&element);
+  if (MayHoldImages(html)) {
+    for (auto& node : nodes) {
+      if (Element* added = dom::AsElement(node.get())) RequestImages(*added);
+    }
+  }
+  switch (where) {
+    case 0:
+      for (Ref<dom::Node>& old : element.RemoveAllChildren()) {
+        if (Element* gone = dom::AsElement(old.get())) ElementsLeaving(*gone);
+      }
+      element.AppendChildren(nodes);
+      break;
+    case 1:
+      for (std::size_t i = 0; i < nodes.size(); ++i) element.InsertNodeAt(i, nodes[i]);
+      break;
+    case 2:
+      element.AppendChildren(nodes);
+      break;
+    default: {
+      std::size_t at = element.nodeIndex() + (where == 5 ? 1 : 0);
+      for (auto& node : nodes) parent->InsertNodeAt(at++, node);
+      if (where == 3) Detach(element);
+      break;
+    }
+  }
+  Update();
+  return true;
+}
+
+void Window::Detach(Element& element) {
+  Element* parent = element.parent();
+  if (parent == nullptr) return;
+  Ref<Element> hold(&element);
+  parent->RemoveChild(&element);
+  ElementsLeaving(element);
+  Update();
+}
+
+void Window::SetInnerText(Element& element, std::u16string_view text) {
+  for (Ref<dom::Node>& old : element.RemoveAllChildren()) {
+    if (Element* gone = dom::AsElement(old.get())) ElementsLeaving(*gone);
+  }
+  if (!text.empty()) element.AppendChild(dom::Text::Create(std::u16string(text)));
+  Update();
+}
+
+bool Window::ShowPopup(Element& popup, Element* anchor, Point at, unsigned placement) {
+  if (popup.document() != document_.get()) return false;
+  HidePopup(popup);
+  popups_.push_back({Ref<Element>(&popup), Ref<Element>(anchor)});
+  popup.SetState(popup.state() | dom::kStatePopup);
+  if (anchor) anchor->SetState(anchor->state() | dom::kStateOwnsPopup);
+  Update();
+  geometry_->PlacePopup(popup, anchor, at, placement);
+  dispatcher_->PostEvent(&popup, events::kPopupReady, anchor ? anchor : &popup, 0);
+  host_.Invalidate(nullptr);
+  return true;
+}
+
+bool Window::HidePopup(Element& popup) {
+  auto found = std::find_if(popups_.begin(), popups_.end(), [&](const Popup& p) { return p.popup.get() == &popup; });
+  if (found == popups_.end()) return false;
+  const Popup gone = *found;
+  popups_.erase(found);
+  popup.SetState(popup.state() & ~dom::kStatePopup);
+  if (gone.anchor) gone.anchor->SetState(gone.anchor->state() & ~dom::kStateOwnsPopup);
+  dispatcher_->PostEvent(&popup, events::kPopupDismissed, gone.anchor ? gone.anchor.get() : &popup, 0);
+  Update();
+  host_.Invalidate(nullptr);
+  return true;
+}
+
+Element* Window::HidePopupHolding(Element& element) {
+  for (const Popup& p : popups_) {
+    if (p.popup.get() == &element || p.popup->IsAncestorOf(&element)) {
+      const Popup held = p;
+      HidePopup(*held.popup);
+      return held.anchor.get();
+    }
+  }
+  return nullptr;
+}
+
+void Window::HttpRequest(Element& initiator, std::u16string url, unsigned dataType, bool post,
+                         std::vector<std::pair<std::u16string, std::u16string>> parameters, Element* into) {
+  if (!http_) http_ = platform::MakeSystemHttpClient();
+  platform::HttpRequest request{url, post, std::move(parameters)};
+  std::weak_ptr<UiThreadQueue> queue = uiThread_;
+  JoinFinishedWorkers();
+  auto done = std::make_shared<std::atomic<bool>>(false);
+  std::thread thread([this, client = http_, request = std::move(request), queue, done, held = Ref<Element>(&initiator),
+                      target = Ref<Element>(into), dataType]() mutable {
+    platform::HttpResponse response = client->Fetch(request);
+    if (auto ui = queue.lock()) {
+      // The element references move with the call: they are released on the UI thread only.
+      auto call = std::make_shared<std::function<void()>>();
+      *call = [this, held = std::move(held), target = std::move(target), url = request.url, dataType,
+               response = std::move(response)]() mutable {
+        DeliverData(std::move(held), std::move(target), std::move(url), dataType, std::move(response));
+      };
+      ui->Post([call] { (*call)(); });
+    }
+    *done = true;
+  });
+  workers_.push_back({std::move(thread), std::move(done)});
+}
+
+void Window::JoinFinishedWorkers() {
+  auto finished = std::stable_partition(workers_.begin(), workers_.end(), [](const Worker& w) { return !*w.done; });
+  for (auto it = finished; it != workers_.end(); ++it) it->thread.join();
+  workers_.erase(finished, workers_.end());
+}
+
+void Window::DeliverData(Ref<Element> initiator, Ref<Element> into, std::u16string url, unsigned dataType,
+                         platform::HttpResponse response) {
+  const bool ok = response.completed && response.status >= 200 && response.status < 300;
+  const unsigned status = ok ? 0u : (response.completed ? response.status : 1u);
+  events::DataArrivedParams params{initiator.get(), response.body.data(), static_cast<unsigned>(response.body.size()),
+                                   dataType, status, url.c_str()};
+  const bool handled = dispatcher_->DeliverToElement(*initiator, events::kHandleDataArrived, &params);
+  if (!handled && ok && into && dataType == events::kDataHtml) {
+    const std::string bytes(response.body.begin(), response.body.end());
+    SetElementHtml(*into, DecodeUtf8(bytes), 0);
+  }
+  Update();
+}
+
+std::optional<events::Clock::duration> Window::RunPending(events::Clock::time_point now) {
+  uiThread_->RunQueued();
+  JoinFinishedWorkers();
+  dispatcher_->RunPosted();
+  dispatcher_->RunDueTimers(now);
+  Update();
+  const auto next = dispatcher_->NextTimer();
+  if (!next) return std::nullopt;
+  return std::max(events::Clock::duration::zero(), *next - now);
+}
+
+}  // namespace kestrune::html::host
