@@ -5,7 +5,7 @@
 
 namespace kestrune {
 
-// Little-endian field reads from a byte buffer; callers check the bounds first.
+// Field reads from a byte buffer, little-endian unless named; callers check the bounds first.
 inline std::uint16_t LoadU16Le(const unsigned char* at) {
   return static_cast<std::uint16_t>(at[0] | (at[1] << 8));
 }
@@ -13,6 +13,12 @@ inline std::uint16_t LoadU16Le(const unsigned char* at) {
 inline std::uint32_t LoadU32Le(const unsigned char* at) {
   return static_cast<std::uint32_t>(at[0]) | (static_cast<std::uint32_t>(at[1]) << 8) |
          (static_cast<std::uint32_t>(at[2]) << 16) | (static_cast<std::uint32_t>(at[3]) << 24);
+}
+
+// Big-endian, as PNG writes its fields.
+inline std::uint32_t LoadU32Be(const unsigned char* at) {
+  return (static_cast<std::uint32_t>(at[0]) << 24) | (static_cast<std::uint32_t>(at[1]) << 16) |
+         (static_cast<std::uint32_t>(at[2]) << 8) | static_cast<std::uint32_t>(at[3]);
 }
 
 inline void StoreU16Le(unsigned char* at, std::uint16_t value) {

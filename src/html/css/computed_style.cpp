@@ -11,7 +11,7 @@ namespace {
 template <typename Style>
 auto InheritedFields(Style& s) {
   return std::tie(s.color, s.fontFamily, s.fontSize, s.fontWeight, s.fontStyle, s.lineHeight, s.textAlign,
-                  s.whiteSpace, s.visibility, s.cursor);
+                  s.whiteSpace, s.visibility, s.cursor, s.borderSpacing);
 }
 
 bool SameBehaviors(const ComputedStyle& a, const ComputedStyle& b) {
@@ -30,6 +30,32 @@ bool ComputedStyle::InheritedEqual(const ComputedStyle& other) const {
   return InheritedFields(*this) == InheritedFields(other);
 }
 
+namespace {
+
+bool SameBorderGeometry(const Border (&a)[4], const Border (&b)[4]) {
+  for (int side = 0; side < 4; ++side) {
+    const bool drawnA = a[side].style != BorderStyle::kNone && a[side].style != BorderStyle::kHidden;
+    const bool drawnB = b[side].style != BorderStyle::kNone && b[side].style != BorderStyle::kHidden;
+    if (drawnA != drawnB || (drawnA && a[side].width != b[side].width)) return false;
+  }
+  return true;
+}
+
+}  // namespace
+
+bool ComputedStyle::LayoutEqual(const ComputedStyle& o) const {
+  return fontFamily == o.fontFamily && fontSize == o.fontSize && fontWeight == o.fontWeight &&
+         fontStyle == o.fontStyle && lineHeight == o.lineHeight && textAlign == o.textAlign &&
+         whiteSpace == o.whiteSpace && borderSpacing == o.borderSpacing && display == o.display &&
+         position == o.position && std::equal(std::begin(offsets), std::end(offsets), std::begin(o.offsets)) &&
+         overflowX == o.overflowX && overflowY == o.overflowY && flow == o.flow && width == o.width &&
+         height == o.height && minWidth == o.minWidth && minHeight == o.minHeight && maxWidth == o.maxWidth &&
+         maxHeight == o.maxHeight && std::equal(std::begin(margin), std::end(margin), std::begin(o.margin)) &&
+         std::equal(std::begin(padding), std::end(padding), std::begin(o.padding)) &&
+         SameBorderGeometry(border, o.border) && boxSizing == o.boxSizing && verticalAlign == o.verticalAlign &&
+         tableLayoutFixed == o.tableLayoutFixed;
+}
+
 bool ComputedStyle::operator==(const ComputedStyle& o) const {
   return InheritedEqual(o) && display == o.display && position == o.position &&
          std::equal(std::begin(offsets), std::end(offsets), std::begin(o.offsets)) && zIndex == o.zIndex &&
@@ -43,7 +69,8 @@ bool ComputedStyle::operator==(const ComputedStyle& o) const {
          backgroundColor == o.backgroundColor && backgroundImage == o.backgroundImage &&
          backgroundRepeat == o.backgroundRepeat &&
          std::equal(std::begin(backgroundPosition), std::end(backgroundPosition), std::begin(o.backgroundPosition)) &&
-         textOverflow == o.textOverflow && verticalAlign == o.verticalAlign && SameBehaviors(*this, o);
+         textOverflow == o.textOverflow && verticalAlign == o.verticalAlign &&
+         tableLayoutFixed == o.tableLayoutFixed && SameBehaviors(*this, o);
 }
 
 namespace {

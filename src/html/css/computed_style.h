@@ -70,6 +70,7 @@ struct ComputedStyle {
   WhiteSpace whiteSpace = WhiteSpace::kNormal;
   Visibility visibility = Visibility::kVisible;
   Cursor cursor = Cursor::kAuto;
+  float borderSpacing = 0;  // px, between table cells and around them
 
   // Not inherited.
   Display display = Display::kInline;
@@ -94,11 +95,14 @@ struct ComputedStyle {
   Length backgroundPosition[2] = {Length::Px(0), Length::Px(0)};
   TextOverflow textOverflow = TextOverflow::kClip;
   VerticalAlign verticalAlign = VerticalAlign::kBaseline;
+  bool tableLayoutFixed = false;  // column widths from the first row (or `col`), not from every cell
   std::shared_ptr<const std::vector<std::string>> behaviors;  // names, in order; null for none
 
   // A fresh style for a child: inherited values copied, the rest at their initial values.
   static ComputedStyle InheritFrom(const ComputedStyle& parent);
   bool InheritedEqual(const ComputedStyle& other) const;
+  // Whether the two styles give the same boxes: what differs only repaints.
+  bool LayoutEqual(const ComputedStyle& other) const;
   bool operator==(const ComputedStyle& other) const;
 };
 

@@ -292,6 +292,8 @@ void CopyProperty(PropertyId id, const ComputedStyle& from, ComputedStyle& to) {
     case P::kLineHeight: to.lineHeight = from.lineHeight; break;
     case P::kCursor: to.cursor = from.cursor; break;
     case P::kBehavior: to.behaviors = from.behaviors; break;
+    case P::kTableLayout: to.tableLayoutFixed = from.tableLayoutFixed; break;
+    case P::kBorderSpacing: to.borderSpacing = from.borderSpacing; break;
     case P::kCount: break;
   }
 }
@@ -429,6 +431,16 @@ void ApplyDeclaration(const Declaration& declaration, ComputedStyle& style, cons
     case P::kCursor: setKeyword(style.cursor, kCursor); break;
     case P::kBehavior:
       if (auto behaviors = Behaviors(v)) style.behaviors = std::move(*behaviors);
+      break;
+    case P::kTableLayout:
+      if (IsKeyword(v, u"fixed")) style.tableLayoutFixed = true;
+      else if (IsKeyword(v, u"auto")) style.tableLayoutFixed = false;
+      break;
+    case P::kBorderSpacing:
+      // One length for both directions; a second one is not taken.
+      if (auto length = SingleLength(v, em); length && length->unit == Length::Unit::kPx && length->value >= 0) {
+        style.borderSpacing = length->value;
+      }
       break;
     case P::kCount: break;
   }

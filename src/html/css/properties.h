@@ -22,7 +22,7 @@ enum class PropertyId : std::uint8_t {
   kBorderTopLeftRadius, kBorderTopRightRadius, kBorderBottomRightRadius, kBorderBottomLeftRadius,
   kBoxSizing, kFontFamily, kFontSize, kFontWeight, kFontStyle, kColor, kBackgroundColor,
   kBackgroundImage, kBackgroundRepeat, kBackgroundPositionX, kBackgroundPositionY, kWhiteSpace,
-  kTextOverflow, kTextAlign, kVerticalAlign, kLineHeight, kCursor, kBehavior,
+  kTextOverflow, kTextAlign, kVerticalAlign, kLineHeight, kCursor, kBehavior, kTableLayout, kBorderSpacing,
   kCount
 };
 

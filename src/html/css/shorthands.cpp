@@ -38,7 +38,7 @@ constexpr PropertyName kLonghands[] = {
     {u"background-position-x", P::kBackgroundPositionX}, {u"background-position-y", P::kBackgroundPositionY},
     {u"white-space", P::kWhiteSpace}, {u"text-overflow", P::kTextOverflow}, {u"text-align", P::kTextAlign},
     {u"vertical-align", P::kVerticalAlign}, {u"line-height", P::kLineHeight}, {u"cursor", P::kCursor},
-    {u"behavior", P::kBehavior},
+    {u"behavior", P::kBehavior}, {u"table-layout", P::kTableLayout}, {u"border-spacing", P::kBorderSpacing},
 };
 
 using Parts = std::vector<std::vector<Token>>;

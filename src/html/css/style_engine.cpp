@@ -259,7 +259,8 @@ void StyleEngine::Visit(dom::Element& element, const std::shared_ptr<const Compu
     ++lastComputed_;
     if (old != fresh) {
       if (!old || !(*old == *fresh)) {
-        element.MarkLayoutDirty();
+        // A change that leaves the boxes as they are (colours, states' backgrounds) only repaints.
+        if (!old || !old->LayoutEqual(*fresh)) element.MarkLayoutDirty();
         element.MarkPaintDirty();
       }
       if (!old || !old->InheritedEqual(*fresh)) forceChildren = true;
