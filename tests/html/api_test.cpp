@@ -212,44 +212,24 @@ TEST_F(ApiTest, ProgramStylesAndStatesChangeTheComputedStyle) {
   EXPECT_EQ(State(box), dom::kStateChecked);
 }
 
-TEST_F(ApiTest, AnswersNoGeometryUntilTheLayoutEngineGivesSome) {
+TEST_F(ApiTest, AnswersGeometryFromTheLayoutAndNoneForAnElementNotShown) {
+  // Body margin 8; the empty table is its 2px of spacing; #first sits 12px (1em) into #box.
   HELEMENT box = Find("#box");
   Rect location;
-  EXPECT_EQ(HTMLayoutGetElementLocation(box, &location, events::kRootRelative | events::kBorderBox),
-            DomResult::kOperationFailed);
-  EXPECT_EQ(HTMLayoutGetScrollInfo(box, nullptr, nullptr, nullptr), DomResult::kOperationFailed);
-  EXPECT_EQ(HTMLayoutSetScrollPos(box, {0, 10}, false), DomResult::kOperationFailed);
-  EXPECT_EQ(HTMLayoutScrollToView(box, 0), DomResult::kOperationFailed);
+  ASSERT_EQ(HTMLayoutGetElementLocation(box, &location, events::kViewRelative | events::kBorderBox), DomResult::kOk);
+  EXPECT_EQ(location, (Rect{8, 10, 892, 70}));
   HELEMENT hit = nullptr;
-  EXPECT_EQ(HTMLayoutFindElement(window_, {5, 5}, &hit), DomResult::kOperationFailed);
-  events::MouseInput click;
-  click.cmd = events::kMouseDown;
-  click.buttons = events::kMainMouseButton;
-  EXPECT_FALSE(HTMLayoutMouseInput(window_, click));  // nowhere to go without a target
+  EXPECT_EQ(HTMLayoutFindElement(window_, {20, 25}, &hit), DomResult::kOk);
+  EXPECT_EQ(hit, Find("#first"));
+  HTMLayoutMouseInput(window_, {events::kMouseMove, {20, 25}, 0, 0, nullptr});
+  EXPECT_TRUE(State(Find("#first")) & dom::kStateHover);
 
-  struct Boxes : events::GeometrySource {
-    HELEMENT only;
-    HELEMENT HitTest(Point) override { return only; }
-    std::optional<Rect> Location(dom::Element&, unsigned) override { return Rect{10, 20, 110, 70}; }
-    std::optional<events::ScrollInfo> GetScrollInfo(dom::Element&) override {
-      return events::ScrollInfo{{0, 5}, {0, 0, 100, 50}, {100, 500}};
-    }
-    bool SetScrollPos(dom::Element&, Point, bool) override { return true; }
-    bool ScrollToView(dom::Element&, bool, bool) override { return true; }
-    bool PlacePopup(dom::Element&, HELEMENT, Point, unsigned) override { return true; }
-  } boxes;
-  boxes.only = Find("#first");
-  HTMLayoutSetGeometry(window_, &boxes);
-  EXPECT_EQ(HTMLayoutGetElementLocation(box, &location, events::kRootRelative), DomResult::kOk);
-  EXPECT_EQ(location, (Rect{10, 20, 110, 70}));
-  Size content;
-  EXPECT_EQ(HTMLayoutGetScrollInfo(box, nullptr, nullptr, &content), DomResult::kOk);
-  EXPECT_EQ(content.height, 500);
-  EXPECT_EQ(HTMLayoutFindElement(window_, {5, 5}, &hit), DomResult::kOk);
-  EXPECT_EQ(hit, boxes.only);
-  HTMLayoutMouseInput(window_, {events::kMouseMove, {30, 30}, 0, 0, nullptr});
-  EXPECT_TRUE(State(boxes.only) & dom::kStateHover);
-  HTMLayoutSetGeometry(window_, nullptr);
+  HTMLayoutSetStyleAttribute(box, "display", u"none");
+  EXPECT_EQ(HTMLayoutGetElementLocation(Find("#first"), &location, events::kRootRelative), DomResult::kOperationFailed);
+  EXPECT_EQ(HTMLayoutGetScrollInfo(box, nullptr, nullptr, nullptr), DomResult::kOperationFailed);
+  EXPECT_EQ(HTMLayoutScrollToView(Find("#second"), 0), DomResult::kOperationFailed);
+  EXPECT_EQ(HTMLayoutFindElement(window_, {20, 25}, &hit), DomResult::kOk);
+  EXPECT_EQ(Id(hit), u"");  // the body now
 }
 
 TEST_F(ApiTest, AWorkerRunsItsCallsOnTheUiThreadInOrderAndWaitsForEach) {

@@ -62,7 +62,7 @@ DomResult HTMLayoutSetCapture(HELEMENT he) {
   if (he == nullptr) return DomResult::kInvalidHandle;
   host::Window* window = WindowOf(he);
   if (window == nullptr) return DomResult::kPassiveHandle;
-  window->input().SetCapture(he);
+  window->SetCapture(he);
   return DomResult::kOk;
 }
 
@@ -70,7 +70,7 @@ DomResult HTMLayoutReleaseCapture(HELEMENT he) {
   if (he == nullptr) return DomResult::kInvalidHandle;
   host::Window* window = WindowOf(he);
   if (window == nullptr) return DomResult::kPassiveHandle;
-  if (window->input().capture() == he) window->input().ReleaseCapture();
+  if (window->input().capture() == he) window->SetCapture(nullptr);
   return DomResult::kOk;
 }
 

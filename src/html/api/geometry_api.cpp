@@ -4,8 +4,8 @@ namespace kestrune::html {
 
 using api_internal::WindowOf;
 
-// Each of these asks the window's geometry; until the layout engine supplies one, the answer is
-// kOperationFailed: there is no box to report, scroll or show.
+// Each of these asks the window's layout; an element that is not shown has no box to report,
+// scroll or show: kOperationFailed.
 
 DomResult HTMLayoutGetElementLocation(HELEMENT he, Rect* location, unsigned areas) {
   if (he == nullptr) return DomResult::kInvalidHandle;

@@ -20,6 +20,10 @@
 
 namespace kestrune::html {
 
+namespace paint {
+class Canvas;
+}
+
 using HELEMENT = dom::Element*;
 using HLWINDOW = host::Window*;
 using ElementEventProc = dom::ElementEventProc;
@@ -71,8 +75,11 @@ bool HTMLayoutKeyInput(HLWINDOW window, const events::KeyInput& input);
 int HTMLayoutRunPending(HLWINDOW window);
 // From a worker thread: runs the call on the UI thread and waits for it.
 void HTMLayoutRunOnUiThread(HLWINDOW window, const std::function<void()>& call);
-// The layout engine's geometry for the window (none: "no geometry").
-DomResult HTMLayoutSetGeometry(HLWINDOW window, events::GeometrySource* geometry);
+// The platform window's client size changed.
+DomResult HTMLayoutSetViewSize(HLWINDOW window, Size size);
+// Paints the area (view coordinates) with the platform's canvas: the host's answer to an
+// invalidation.
+DomResult HTMLayoutPaint(HLWINDOW window, paint::Canvas& canvas, const Rect& area);
 
 // --- Element handles -----------------------------------------------------------------------
 // Each handle the program keeps holds one reference; a held element stays valid after it
@@ -143,7 +150,7 @@ DomResult HTMLayoutSetTimerEx(HELEMENT he, unsigned milliseconds, std::uintptr_t
 DomResult HTMLayoutSetCapture(HELEMENT he);
 DomResult HTMLayoutReleaseCapture(HELEMENT he);
 
-// --- Geometry: answered by the layout engine; kOperationFailed while there is none ------------
+// --- Geometry: answered by the layout engine; kOperationFailed for an element not shown -------
 DomResult HTMLayoutGetElementLocation(HELEMENT he, Rect* location, unsigned areas);
 DomResult HTMLayoutGetScrollInfo(HELEMENT he, Point* position, Rect* view, Size* content);
 DomResult HTMLayoutSetScrollPos(HELEMENT he, Point position, bool smooth);

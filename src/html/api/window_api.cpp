@@ -89,9 +89,7 @@ DomResult HTMLayoutWindowDetachEventHandler(HLWINDOW window, ElementEventProc pr
 
 bool HTMLayoutMouseInput(HLWINDOW window, const events::MouseInput& input) {
   if (window == nullptr) return false;
-  const bool handled = window->input().Mouse(input);
-  window->Update();
-  return handled;
+  return window->MouseInput(input);
 }
 
 bool HTMLayoutKeyInput(HLWINDOW window, const events::KeyInput& input) {
@@ -112,9 +110,16 @@ void HTMLayoutRunOnUiThread(HLWINDOW window, const std::function<void()>& call) 
   if (window) window->uiThread().Send(call);
 }
 
-DomResult HTMLayoutSetGeometry(HLWINDOW window, events::GeometrySource* geometry) {
+DomResult HTMLayoutSetViewSize(HLWINDOW window, Size size) {
   if (window == nullptr) return DomResult::kInvalidWindow;
-  window->SetGeometry(geometry);
+  if (size.width < 0 || size.height < 0) return DomResult::kInvalidParameter;
+  window->SetViewSize(size);
+  return DomResult::kOk;
+}
+
+DomResult HTMLayoutPaint(HLWINDOW window, paint::Canvas& canvas, const Rect& area) {
+  if (window == nullptr) return DomResult::kInvalidWindow;
+  window->Paint(canvas, area);
   return DomResult::kOk;
 }
 

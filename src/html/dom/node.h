@@ -193,6 +193,7 @@ class Element : public Node {
   void MarkLayoutDirty();
   void MarkPaintDirty();
   std::unique_ptr<Extension>& layoutData() { return layout_; }
+  Extension* layoutDataIfAny() const { return layout_.get(); }
 
   RareData& rare();
   RareData* rareIfAny() const { return rare_.get(); }

@@ -131,6 +131,15 @@ void EventDispatcher::PostTask(std::function<void()> task) {
   if (depth_ == 0 && !draining_ && wakeUp_) wakeUp_();
 }
 
+EventDispatcher::Hold::Hold(EventDispatcher& dispatcher) : dispatcher_(dispatcher), wasDraining_(dispatcher.draining_) {
+  dispatcher_.draining_ = true;
+}
+
+EventDispatcher::Hold::~Hold() {
+  dispatcher_.draining_ = wasDraining_;
+  if (!wasDraining_ && !dispatcher_.posted_.empty() && dispatcher_.wakeUp_) dispatcher_.wakeUp_();
+}
+
 void EventDispatcher::Settle() {
   if (!draining_) RunPosted();
 }

@@ -59,6 +59,20 @@ class EventDispatcher {
 
   dom::Document& document() { return document_; }
 
+  // While one lives (the view is being painted), posted events wait: they run at the host's
+  // next wake-up, never in the middle of a paint.
+  class Hold {
+   public:
+    explicit Hold(EventDispatcher& dispatcher);
+    ~Hold();
+    Hold(const Hold&) = delete;
+    Hold& operator=(const Hold&) = delete;
+
+   private:
+    EventDispatcher& dispatcher_;
+    bool wasDraining_;
+  };
+
  private:
   struct WindowHandler {
     dom::ElementEventProc proc;

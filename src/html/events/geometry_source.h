@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <optional>
 
 #include "html/dom/geometry.h"
@@ -20,8 +21,8 @@ enum ElementAreas : unsigned {
   kBackImageArea = 0x40, kForeImageArea = 0x50, kScrollableArea = 0x60,
 };
 
-// Everything that needs boxes on a screen. The layout engine supplies it; until a document is
-// laid out the answer is "no geometry": no hit, no location, no scrolling.
+// Everything that needs boxes on a screen: the layout engine answers it. Elements that are not
+// laid out (not shown, not in the document) have no location and take no hit.
 class GeometrySource {
  public:
   virtual ~GeometrySource() = default;
@@ -32,16 +33,9 @@ class GeometrySource {
   virtual bool ScrollToView(dom::Element& element, bool toTop, bool smooth) = 0;
   // Places a shown popup next to its anchor (placement code) or at a view point.
   virtual bool PlacePopup(dom::Element& popup, dom::Element* anchor, Point at, unsigned placement) = 0;
-};
-
-class NoGeometry final : public GeometrySource {
- public:
-  dom::Element* HitTest(Point) override { return nullptr; }
-  std::optional<Rect> Location(dom::Element&, unsigned) override { return std::nullopt; }
-  std::optional<ScrollInfo> GetScrollInfo(dom::Element&) override { return std::nullopt; }
-  bool SetScrollPos(dom::Element&, Point, bool) override { return false; }
-  bool ScrollToView(dom::Element&, bool, bool) override { return false; }
-  bool PlacePopup(dom::Element&, dom::Element*, Point, unsigned) override { return false; }
+  // The position in the element's text (UTF-16 units) nearest to a view point: where a click
+  // puts a text field's caret.
+  virtual std::optional<std::size_t> CharacterAt(dom::Element& element, Point viewPoint) = 0;
 };
 
 }  // namespace kestrune::html::events

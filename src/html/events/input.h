@@ -7,13 +7,14 @@ namespace kestrune::html::events {
 
 // Input in platform-neutral form, as the window hosts deliver it.
 struct MouseInput {
-  unsigned cmd = kMouseMove;  // MouseEvents
+  unsigned cmd = kMouseMove;  // MouseEvents; kMouseLeave: the pointer left the window
   Point pos;                  // in the view
   unsigned buttons = 0;       // MouseButtons
   unsigned keys = 0;          // KeyboardStates
-  // The element under the pointer when the caller knows it (tests, a host without layout);
-  // otherwise the geometry's hit test decides.
+  // The element under the pointer when the caller knows it (tests); otherwise the layout's
+  // hit test decides.
   dom::Element* target = nullptr;
+  int wheelDelta = 0;  // kMouseWheel: notches, positive away from the user (scrolls up)
 };
 
 struct KeyInput {

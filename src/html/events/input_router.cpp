@@ -57,6 +57,10 @@ void InputRouter::MoveHover(Element* target, const MouseInput& input) {
 }
 
 bool InputRouter::Mouse(const MouseInput& input) {
+  if (input.cmd == kMouseLeave && !input.target) {
+    MoveHover(nullptr, input);
+    return false;
+  }
   Element* target = capture_ ? capture_.get() : (input.target ? input.target : geometry_->HitTest(input.pos));
   if (!capture_) target = Retarget(target);
   if (target == nullptr) return false;
@@ -77,8 +81,12 @@ bool InputRouter::Mouse(const MouseInput& input) {
 
   Point local = input.pos;
   if (auto box = geometry_->Location(*target, kViewRelative | kBorderBox)) local = {input.pos.x - box->left, input.pos.y - box->top};
-  MouseParams params{input.cmd, target, local, input.pos, input.buttons, input.keys, kCursorArrow, false, nullptr, 0};
+  // The wheel's notches travel in the button state, as the engine's events carry them.
+  const unsigned buttons = input.cmd == kMouseWheel ? static_cast<unsigned>(input.wheelDelta) : input.buttons;
+  const unsigned cursor = cursorOf_ ? cursorOf_(*target) : unsigned{kCursorArrow};
+  MouseParams params{input.cmd, target, local, input.pos, buttons, input.keys, cursor, false, nullptr, 0};
   const bool handled = dispatcher_.Route(target, kHandleMouse, &params, params.cmd);
+  cursor_ = params.cursorType;
 
   if (input.cmd == kMouseUp && active_) {
     SetStateOnChain(active_.get(), dom::kStateActive, false);

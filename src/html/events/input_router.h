@@ -1,5 +1,7 @@
 #pragma once
 
+#include <functional>
+
 #include "html/events/dispatcher.h"
 #include "html/events/geometry_source.h"
 #include "html/events/input.h"
@@ -13,12 +15,17 @@ class InputRouter {
  public:
   InputRouter(EventDispatcher& dispatcher, GeometrySource& geometry);
 
-  void SetGeometry(GeometrySource& geometry) { geometry_ = &geometry; }
   bool Mouse(const MouseInput& input);
   bool Key(const KeyInput& input);
 
   Element* focus() const { return focus_.get(); }
   void SetFocus(Element* element, bool byMouse);
+  // The cursor an element asks for (its style's), put in the mouse parameters before they are
+  // routed; handlers may change it there.
+  void SetCursorSource(std::function<unsigned(const Element&)> source) { cursorOf_ = std::move(source); }
+  // The cursor the last mouse event ended with.
+  unsigned cursor() const { return cursor_; }
+  Element* hover() const { return hover_.get(); }
   Element* capture() const { return capture_.get(); }
   void SetCapture(Element* element) { capture_ = dom::Ref<Element>(element); }
   void ReleaseCapture() { capture_ = {}; }
@@ -39,6 +46,8 @@ class InputRouter {
   dom::Ref<Element> hover_;
   dom::Ref<Element> capture_;
   dom::Ref<Element> active_;
+  std::function<unsigned(const Element&)> cursorOf_;
+  unsigned cursor_ = kCursorArrow;
 };
 
 }  // namespace kestrune::html::events

@@ -54,6 +54,7 @@ bool Window::LoadHtml(const unsigned char* bytes, std::size_t length, std::u16st
   styles_->ClearPageSheets();
   LoadStyleSheets();
   RequestImages(*document_->root());
+  view_->ImagesChanged();
   Update();
   NotificationHeader complete{this, 0, kNotifyDocumentComplete};
   Notify(complete);
@@ -69,7 +70,8 @@ bool Window::DataReady(std::u16string_view uri, const unsigned char* bytes, std:
   }
   // Given outside a request: a resource for the page from now on.
   resources_[std::u16string(uri)] = std::move(data);
-  host_.Invalidate(nullptr);
+  view_->ImagesChanged();
+  Update();
   return true;
 }
 

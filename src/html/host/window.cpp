@@ -34,9 +34,16 @@ Window::Window(WindowHost& host)
       document_(std::make_unique<dom::Document>()),
       styles_(std::make_unique<css::StyleEngine>(*document_)),
       dispatcher_(std::make_unique<events::EventDispatcher>(*document_)),
-      input_(std::make_unique<events::InputRouter>(*dispatcher_, noGeometry_)),
+      view_(std::make_unique<layout::LayoutView>(*document_, host.Measurer(), static_cast<layout::ImageSource&>(*this))),
+      input_(std::make_unique<events::InputRouter>(*dispatcher_, *view_)),
       uiThread_(std::make_shared<UiThreadQueue>([&host] { host.RequestWakeUp(); })) {
   dispatcher_->SetWakeUp([this] { host_.RequestWakeUp(); });
+  view_->SetViewSize(host.ClientSize());
+  view_->SetScrollHandler([this](Element& element, unsigned cmd, int position, bool vertical) {
+    events::ScrollParams params{cmd, &element, position, vertical};
+    return dispatcher_->Route(&element, events::kHandleScroll, &params, params.cmd);
+  });
+  input_->SetCursorSource([this](const Element& element) { return CursorOf(element); });
   Update();
 }
 
@@ -50,9 +57,97 @@ void Window::SetCallback(NotificationCallback callback, void* context) {
   callbackContext_ = context;
 }
 
-void Window::SetGeometry(events::GeometrySource* geometry) {
-  geometry_ = geometry ? geometry : &noGeometry_;
-  input_->SetGeometry(*geometry_);
+void Window::SetViewSize(Size size) {
+  view_->SetViewSize(size);
+  Update();
+}
+
+paint::PaintStats Window::Paint(paint::Canvas& canvas, const Rect& area) {
+  Update();
+  const paint::PaintStats stats = paint::PaintView(*view_, canvas, area, dispatcher_.get());
+  DeliverSizeEvents();
+  return stats;
+}
+
+// Size events go to the handlers of elements whose boxes changed size; posted, since layout
+// runs in the middle of painting or of a geometry question.
+void Window::DeliverSizeEvents() {
+  for (Ref<Element>& element : view_->TakeResized()) {
+    dispatcher_->PostTask([this, element] { dispatcher_->DeliverToElement(*element, events::kHandleSize, nullptr); });
+  }
+}
+
+unsigned Window::CursorOf(const Element& element) const {
+  using css::Cursor;
+  for (const Element* e = &element; e; e = e->parent()) {
+    if (!e->style()) continue;
+    switch (e->style()->cursor) {
+      case Cursor::kAuto: return events::kCursorArrow;
+      case Cursor::kDefault: return events::kCursorArrow;
+      case Cursor::kPointer: return events::kCursorHand;
+      case Cursor::kText: return events::kCursorIBeam;
+      case Cursor::kWait: return events::kCursorWait;
+      case Cursor::kMove: return events::kCursorSizeAll;
+      case Cursor::kCrosshair: return events::kCursorCross;
+      case Cursor::kHelp: return events::kCursorHelp;
+      case Cursor::kNotAllowed: return events::kCursorNo;
+      case Cursor::kEResize:
+      case Cursor::kColResize: return events::kCursorSizeWe;
+      case Cursor::kNResize:
+      case Cursor::kRowResize: return events::kCursorSizeNs;
+    }
+  }
+  return events::kCursorArrow;
+}
+
+bool Window::MouseInput(const events::MouseInput& input) {
+  Update();
+  // A press outside every shown popup closes them, as a click outside a menu does.
+  if (input.cmd == events::kMouseDown && !popups_.empty() && !input_->capture()) {
+    Element* hit = input.target ? input.target : view_->HitTest(input.pos);
+    const bool inside = std::any_of(popups_.begin(), popups_.end(), [&](const Popup& p) {
+      return hit && (hit == p.popup.get() || p.popup->IsAncestorOf(hit));
+    });
+    if (!inside) {
+      const std::vector<Popup> shown = popups_;
+      for (const Popup& p : shown) HidePopup(*p.popup);
+    }
+  }
+  bool handled = false;
+  if (!input.target && view_->ScrollBarInput(input)) {
+    handled = true;
+  } else {
+    handled = input_->Mouse(input);
+    if (!handled && input.cmd == events::kMouseWheel) {
+      Element* target = input.target ? input.target : view_->HitTest(input.pos);
+      handled = view_->Wheel(target, input.wheelDelta);
+    }
+  }
+  if (input_->cursor() != cursor_) {
+    cursor_ = input_->cursor();
+    host_.SetCursor(cursor_);
+  }
+  SyncCapture();
+  Update();
+  return handled;
+}
+
+void Window::SetCapture(Element* element) {
+  if (element) input_->SetCapture(element);
+  else input_->ReleaseCapture();
+  SyncCapture();
+}
+
+void Window::SyncCapture() {
+  const bool captured = input_->capture() != nullptr;
+  if (captured == captured_) return;
+  captured_ = captured;
+  host_.SetMouseCapture(captured);
+}
+
+const std::vector<unsigned char>* Window::ImageData(const std::u16string& url) {
+  if (const auto* data = Resource(url)) return data;
+  return Resource(CombineUrl(document_->url(), url));
 }
 
 std::intptr_t Window::Notify(NotificationHeader& header) {
@@ -126,15 +221,17 @@ void Window::Update() {
     }
   }
   updating_ = false;
-  Element* root = document_->root();
-  if (root && (root->dirty() & (dom::kPaintDirty | dom::kChildPaintDirty))) host_.Invalidate(nullptr);
+  for (const Rect& area : view_->TakeDamage()) host_.Invalidate(&area);
+  DeliverSizeEvents();
 }
 
 void Window::Redraw(Element* element, bool now) {
   Update();
-  std::optional<Rect> area;
-  if (element) area = geometry_->Location(*element, events::kViewRelative | events::kBorderBox);
-  host_.Invalidate(area ? &*area : nullptr);
+  if (element) {
+    if (auto area = view_->Location(*element, events::kViewRelative | events::kBorderBox)) host_.Invalidate(&*area);
+  } else {
+    host_.Invalidate(nullptr);
+  }
   if (now) host_.UpdateNow();
 }
 
@@ -197,9 +294,9 @@ bool Window::ShowPopup(Element& popup, Element* anchor, Point at, unsigned place
   popup.SetState(popup.state() | dom::kStatePopup);
   if (anchor) anchor->SetState(anchor->state() | dom::kStateOwnsPopup);
   Update();
-  geometry_->PlacePopup(popup, anchor, at, placement);
+  view_->PlacePopup(popup, anchor, at, placement);
   dispatcher_->PostEvent(&popup, events::kPopupReady, anchor ? anchor : &popup, 0);
-  host_.Invalidate(nullptr);
+  Update();
   return true;
 }
 
@@ -208,11 +305,12 @@ bool Window::HidePopup(Element& popup) {
   if (found == popups_.end()) return false;
   const Popup gone = *found;
   popups_.erase(found);
+  // Where it was is repainted before it goes.
+  if (auto area = view_->Location(popup, events::kViewRelative | events::kMarginBox)) host_.Invalidate(&*area);
   popup.SetState(popup.state() & ~dom::kStatePopup);
   if (gone.anchor) gone.anchor->SetState(gone.anchor->state() & ~dom::kStateOwnsPopup);
   dispatcher_->PostEvent(&popup, events::kPopupDismissed, gone.anchor ? gone.anchor.get() : &popup, 0);
   Update();
-  host_.Invalidate(nullptr);
   return true;
 }
 
@@ -276,8 +374,11 @@ std::optional<events::Clock::duration> Window::RunPending(events::Clock::time_po
   JoinFinishedWorkers();
   dispatcher_->RunPosted();
   dispatcher_->RunDueTimers(now);
+  const bool animating = view_->Animate(now);
   Update();
-  const auto next = dispatcher_->NextTimer();
+  auto next = dispatcher_->NextTimer();
+  // A smooth scroll under way wants the next frame soon.
+  if (animating) next = std::min(next.value_or(events::Clock::time_point::max()), now + std::chrono::milliseconds(16));
   if (!next) return std::nullopt;
   return std::max(events::Clock::duration::zero(), *next - now);
 }

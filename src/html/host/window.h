@@ -14,15 +14,17 @@
 #include "html/events/input_router.h"
 #include "html/host/ui_thread.h"
 #include "html/host/window_host.h"
+#include "html/layout/layout_view.h"
+#include "html/paint/painter.h"
 #include "platform/http.h"
 
 namespace kestrune::html::host {
 
-// One document shown in one window: the document and its style, event delivery and input,
-// page loading with the program's load-data and attach-behavior notifications, popups, timers,
-// HTTP requests, and the queue onto the UI thread. Everything but the queue's Post and Send is
-// for the UI thread only.
-class Window final : public controls::ControlHost {
+// One document shown in one window: the document and its style, its layout and painting,
+// event delivery and input, page loading with the program's load-data and attach-behavior
+// notifications, popups, timers, HTTP requests, and the queue onto the UI thread. Everything
+// but the queue's Post and Send is for the UI thread only.
+class Window final : public controls::ControlHost, private layout::ImageSource {
  public:
   explicit Window(WindowHost& host);
   ~Window() override;
@@ -33,13 +35,19 @@ class Window final : public controls::ControlHost {
   css::StyleEngine& styles() { return *styles_; }
   events::EventDispatcher& dispatcher() override { return *dispatcher_; }
   events::InputRouter& input() override { return *input_; }
-  events::GeometrySource& geometry() override { return *geometry_; }
+  events::GeometrySource& geometry() override { return *view_; }
+  layout::LayoutView& view() { return *view_; }
   UiThreadQueue& uiThread() { return *uiThread_; }
   WindowHost& host() { return host_; }
 
   void SetCallback(NotificationCallback callback, void* context);
-  // The layout engine's geometry; none restores "no geometry".
-  void SetGeometry(events::GeometrySource* geometry);
+  void SetViewSize(Size size);
+  // Paints the area of the view (brought up to date first) onto the platform's canvas.
+  paint::PaintStats Paint(paint::Canvas& canvas, const Rect& area);
+  // Input from the platform: scroll bars and the wheel are the engine's; the rest is routed to
+  // the elements. Popups close when the user presses outside them.
+  bool MouseInput(const events::MouseInput& input);
+  void SetCapture(dom::Element* element);
   void SetHttpClient(std::shared_ptr<platform::HttpClient> client) { http_ = std::move(client); }
 
   // Loads a page (UTF-8, or UTF-16 with its byte order mark). Its style sheets and images are
@@ -87,6 +95,10 @@ class Window final : public controls::ControlHost {
   };
   struct PendingLoad;
 
+  const std::vector<unsigned char>* ImageData(const std::u16string& url) override;
+  unsigned CursorOf(const dom::Element& element) const;
+  void SyncCapture();
+  void DeliverSizeEvents();
   std::intptr_t Notify(NotificationHeader& header);
   std::optional<std::vector<unsigned char>> Fetch(const std::u16string& url, unsigned dataType, dom::Element* initiator);
   void LoadStyleSheets();
@@ -101,8 +113,7 @@ class Window final : public controls::ControlHost {
   std::unique_ptr<dom::Document> document_;
   std::unique_ptr<css::StyleEngine> styles_;
   std::unique_ptr<events::EventDispatcher> dispatcher_;
-  events::NoGeometry noGeometry_;
-  events::GeometrySource* geometry_ = &noGeometry_;
+  std::unique_ptr<layout::LayoutView> view_;
   std::unique_ptr<events::InputRouter> input_;
   std::shared_ptr<UiThreadQueue> uiThread_;
   std::shared_ptr<platform::HttpClient> http_;
@@ -118,6 +129,8 @@ class Window final : public controls::ControlHost {
   std::vector<Popup> popups_;
   PendingLoad* pendingLoad_ = nullptr;
   bool updating_ = false;
+  bool captured_ = false;
+  unsigned cursor_ = events::kCursorArrow;
 };
 
 }  // namespace kestrune::html::host

@@ -5,19 +5,31 @@
 
 #include "html/dom/geometry.h"
 #include "html/dom/handle.h"
+#include "html/layout/text_measurer.h"
 
 namespace kestrune::html::host {
 
 class Window;
 
 // The platform side of a window: what the engine asks of the native window (or of a test).
+// The platform paints by calling HTMLayoutPaint with its canvas for the invalid area.
 class WindowHost {
  public:
   virtual ~WindowHost() = default;
-  // Something must be repainted; no area means the whole window.
+  // Something must be repainted; no area means the whole window. The engine asks for the
+  // smallest area it knows to be affected.
   virtual void Invalidate(const Rect* area) = 0;
-  // Paint what is invalid now ("redraw at once").
+  // Paint what is invalid now, before returning ("redraw at once").
   virtual void UpdateNow() {}
+  // How text is measured in this window: the measuring side of the canvas it paints with. The
+  // default measures with FixedMetrics (no fonts), for windows that are never shown.
+  virtual const layout::TextMeasurer& Measurer();
+  // The size of the view when the window is made (the program's window: 900 x 623); later
+  // sizes come through HTMLayoutSetViewSize.
+  virtual Size ClientSize() const { return {900, 623}; }
+  // An element holds the mouse: the platform window should get the pointer's input even
+  // outside itself until it is released.
+  virtual void SetMouseCapture(bool captured) { (void)captured; }
   // Called from any thread: make the UI thread call Window::RunPending soon.
   virtual void RequestWakeUp() = 0;
   virtual void SetCursor(unsigned cursorType) { (void)cursorType; }
