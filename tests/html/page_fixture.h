@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <ostream>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -9,6 +10,15 @@
 #include "html/api/htmlayout.h"
 #include "html/host/headless_host.h"
 #include "html/host/window.h"
+
+namespace kestrune::html {
+
+inline void PrintTo(const Rect& r, std::ostream* out) {
+  *out << "{" << r.left << ", " << r.top << ", " << r.right << ", " << r.bottom << "}";
+}
+inline void PrintTo(const Point& p, std::ostream* out) { *out << "(" << p.x << ", " << p.y << ")"; }
+
+}  // namespace kestrune::html
 
 namespace kestrune::html::test {
 

@@ -71,11 +71,18 @@ void TextEdit::MoveCaret(std::size_t to, bool extend) {
 }
 
 bool TextEdit::OnMouse(Element& element, MouseParams& mouse) {
-  // Without geometry the caret cannot follow the pointer; a press puts it at the end.
-  if (mouse.cmd == kMouseDown && (mouse.buttonState & kMainMouseButton)) {
-    MoveCaret(Text(element).size(), false);
+  // A press puts the caret at the character under the pointer (Shift extends the selection);
+  // moving with the button held selects.
+  const bool main = (mouse.buttonState & kMainMouseButton) != 0;
+  if ((mouse.cmd == kMouseDown && main) || (mouse.cmd == kMouseMove && main && selecting_)) {
+    const std::size_t size = Text(element).size();
+    const std::size_t at = std::min(host().geometry().CharacterAt(element, mouse.posDocument).value_or(size), size);
+    MoveCaret(at, mouse.cmd == kMouseMove || (mouse.altState & kShiftKeyPressed));
+    selecting_ = true;
+    element.MarkPaintDirty();
     return true;
   }
+  if (mouse.cmd == kMouseUp) selecting_ = false;
   return false;
 }
 
@@ -84,6 +91,7 @@ bool TextEdit::OnKey(Element& element, KeyParams& key) {
   const bool shift = key.altState & kShiftKeyPressed;
   const bool control = key.altState & kControlKeyPressed;
   const std::size_t size = Text(element).size();
+  element.MarkPaintDirty();  // the caret or the selection may move
   if (key.cmd == kKeyChar) {
     if (control || (key.altState & kAltKeyPressed)) return false;
     char16_t c = static_cast<char16_t>(key.keyCode);

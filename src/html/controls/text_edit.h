@@ -7,7 +7,7 @@
 namespace kestrune::html::controls {
 
 // A text input: the element's text is its value. The caret and the selection are positions in
-// that text (UTF-16 units); the painter draws them from here.
+// that text (UTF-16 units); the painter draws them from here, the layout says where a click is.
 class TextEdit final : public Control {
  public:
   using Control::Control;
@@ -37,6 +37,7 @@ class TextEdit final : public Control {
 
   std::size_t caret_ = 0;
   std::size_t anchor_ = 0;
+  bool selecting_ = false;
   std::u16string returned_;  // the text a "get text" method call points to
 };
 

@@ -372,6 +372,7 @@ void Window::DeliverData(Ref<Element> initiator, Ref<Element> into, std::u16stri
 std::optional<events::Clock::duration> Window::RunPending(events::Clock::time_point now) {
   uiThread_->RunQueued();
   JoinFinishedWorkers();
+  Update();  // size events of the last layout are posted with the rest
   dispatcher_->RunPosted();
   dispatcher_->RunDueTimers(now);
   const bool animating = view_->Animate(now);

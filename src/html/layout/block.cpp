@@ -139,6 +139,7 @@ class Block final : public Renderer {
     Element* element;
     Edges margins;
     int x;
+    int width;
     bool flexible;
   };
 
@@ -191,7 +192,7 @@ class Block final : public Renderer {
       }
       Box* childBox = &EnsureBox(child);
       PlaceChild(child, *childBox, x, y, contentWidth, contentCbHeight);
-      placed.push_back({&child, margins, x, flexible});
+      placed.push_back({&child, margins, x, width, flexible});
       if (childBox->Has(kBoxOverflows)) sorted = false;
       cursor = y + (flexible ? 0 : childBox->height);
       pendingMargin = margins.bottom;
@@ -236,8 +237,8 @@ class Block final : public Renderer {
         free -= height;
         remainingWeight -= share;
         const Edges childInsets = Insets(*child.style(), contentWidth);
-        height = ResolveHeight(*child.style(), {childBox->width, -1, contentWidth, -1}, childInsets, height - childInsets.vertical());
-        LayoutElement(child, {childBox->width, height, contentWidth, contentCbHeight}, ctx);
+        height = ResolveHeight(*child.style(), {placed[k].width, -1, contentWidth, -1}, childInsets, height - childInsets.vertical());
+        LayoutElement(child, {placed[k].width, height, contentWidth, contentCbHeight}, ctx);
       }
       PlaceChild(child, *childBox, placed[k].x, y, contentWidth, contentCbHeight);
       cursor = y + childBox->height;

@@ -93,6 +93,7 @@ std::optional<Rect> LayoutView::Locate(const Element& element, unsigned areas) {
   auto origin = OriginInView(element);
   if (!box || !origin) return std::nullopt;
   const css::ComputedStyle& style = *element.style();
+  ctx_.ForgetStyles();
   Rect border{0, 0, box->width, box->height};
   if (box->Has(kBoxInline)) {
     // The union of the element's pieces on its container's lines.
@@ -100,9 +101,10 @@ std::optional<Rect> LayoutView::Locate(const Element& element, unsigned areas) {
     while (container && BoxOf(*container) && BoxOf(*container)->Has(kBoxInline)) container = container->parent();
     if (!container) return std::nullopt;
     Rect found;
+    const FontMetrics& m = ctx_.MetricsOf(style);
     for (const PlacedLine& line : LinesOf(*container, PlaceMode::kMeasureAll)) {
       for (const InlineFragment& f : line.fragments) {
-        if (f.element == &element) found = Union(found, {f.left, line.top, f.right, line.top + line.height});
+        if (f.element == &element) found = Union(found, {f.left, line.baseline - m.ascent, f.right, line.baseline + m.descent});
       }
       for (const PlacedRun& run : line.runs) {
         if (run.element == &element || element.IsAncestorOf(run.element)) {

@@ -94,7 +94,7 @@ void Collect(Element& parent, std::uint32_t first, std::uint32_t end, std::vecto
         Box& box = EnsureBox(child);
         box.flags = kBoxInline;
         box.x = box.y = box.width = box.height = 0;
-        child.ClearDirty(dom::kLayoutDirty | dom::kChildLayoutDirty);
+        child.ClearDirty(dom::kLayoutDirty | dom::kChildLayoutDirty | dom::kPaintDirty);
       }
       items.push_back({ItemKind::kOpen, &child, style, {}, offset});
       Collect(child, 0, static_cast<std::uint32_t>(child.nodes().size()), items, offset, ctx, depth + 1);

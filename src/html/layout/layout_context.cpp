@@ -14,6 +14,7 @@ void LayoutContext::BeginPass(Size viewSize) {
   resized.clear();
   intrinsic.clear();
   depth = 0;
+  laidOut = 0;
   ForgetStyles();
 }
 

@@ -50,6 +50,7 @@ class LayoutContext {
   // Intrinsic widths computed in this pass.
   std::unordered_map<const Element*, IntrinsicWidths> intrinsic;
   int depth = 0;
+  int laidOut = 0;  // boxes laid out (not kept) in this pass
 
   void BeginPass(Size viewSize);
   // Forgets the memo of the last style: a style object may be freed and another take its

@@ -100,7 +100,8 @@ void LayoutPositionedDescendants(Element& container, Box& box, LayoutContext& ct
   for (std::size_t i = 0; i < list.size(); ++i) {
     dom::Ref<Element> element = list[i];
     const bool fixed = element->style()->position == css::Position::kFixed;
-    const Rect area = fixed ? Rect{0, 0, ctx.view.width, ctx.view.height} : padding;
+    // Fixed boxes sit in the view, less the document's scroll bars.
+    const Rect area = fixed ? ScrollViewport(container, box) : padding;
     const Point inParent = EnsureBox(*element).Extras().staticPosition;
     Point staticPoint = inParent;
     if (element->parent()) {

@@ -134,7 +134,7 @@ void LayoutScroller(Element& element, Box& box, const BoxInput& input, LayoutCon
 void HideSubtree(Element& element) {
   for (Element* e = &element; e; e = dom::NextElementInOrder(e, &element)) {
     if (Box* box = BoxOf(*e)) box->flags = kBoxHidden;
-    e->ClearDirty(dom::kLayoutDirty | dom::kChildLayoutDirty);
+    e->ClearDirty(dom::kLayoutDirty | dom::kChildLayoutDirty | dom::kPaintDirty | dom::kChildPaintDirty);
   }
 }
 
@@ -147,6 +147,7 @@ void LayoutElement(Element& element, const BoxInput& input, LayoutContext& ctx) 
     return;
   }
   const ComputedStyle& style = *element.style();
+  ++ctx.laidOut;
   const int oldWidth = box.width, oldHeight = box.height;
   const bool hadHeader = box.extras && box.extras->headerHeight;
   box.flags = 0;
@@ -178,7 +179,8 @@ void LayoutElement(Element& element, const BoxInput& input, LayoutContext& ctx) 
     const Edges insets = Insets(style, input.cbWidth);
     box.Set(kBoxOverflows, box.contentHeight + insets.vertical() > box.height);
   }
-  if (!box.Has(kBoxPartial)) element.ClearDirty(dom::kLayoutDirty | dom::kChildLayoutDirty);
+  // Laid out again inside an area already asked to be repainted (see LayoutView::TakeDamage).
+  if (!box.Has(kBoxPartial)) element.ClearDirty(dom::kLayoutDirty | dom::kChildLayoutDirty | dom::kPaintDirty);
   if ((oldWidth != box.width || oldHeight != box.height) && HasSizeHandler(element)) ctx.resized.push_back(&element);
 }
 

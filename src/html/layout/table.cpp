@@ -233,8 +233,11 @@ std::vector<int> Distribute(const std::vector<Column>& columns, int available, b
   long long weight = 0;
   for (std::size_t k : open) weight += std::max(1, columns[k].max);
   for (std::size_t i = 0; i < open.size() && rest > 0; ++i) {
-    const int give = static_cast<int>(static_cast<long long>(rest) * std::max(1, columns[open[i]].max) / std::max(1LL, weight));
+    const long long share = std::max(1, columns[open[i]].max);
+    const int give = i + 1 == open.size() ? rest : static_cast<int>(static_cast<long long>(rest) * share / std::max(1LL, weight));
     widths[open[i]] += give;
+    rest -= give;
+    weight -= share;
   }
   return widths;
 }
@@ -274,7 +277,7 @@ class Table final : public Renderer {
       groupBox.y = groupTop;
       groupBox.width = contentWidth;
       groupBox.height = std::max(0, bottom - groupTop);
-      group->ClearDirty(dom::kLayoutDirty | dom::kChildLayoutDirty);
+      group->ClearDirty(dom::kLayoutDirty | dom::kChildLayoutDirty | dom::kPaintDirty);
       group = nullptr;
     };
     for (const Row& row : s.rows) {
@@ -360,7 +363,7 @@ class Table final : public Renderer {
       cellBox.height = height;
     }
     rowBox.height = height;
-    row.ClearDirty(dom::kLayoutDirty | dom::kChildLayoutDirty);
+    row.ClearDirty(dom::kLayoutDirty | dom::kChildLayoutDirty | dom::kPaintDirty);
     return height;
   }
 };
