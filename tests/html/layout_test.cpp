@@ -87,15 +87,26 @@ TEST_F(LayoutTest, PercentageAndFlexibleHeightsShareAVerticalFlow) {
   EXPECT_EQ(Box("#f4"), (Rect{0, 150, 900, 200}));
 }
 
+TEST_F(LayoutTest, FlexibleHeightsLeaveRoomForLinesAndCollapsedMargins) {
+  Load(R"(<body style="margin:0; font-size:10px"><div id=col style="height:100px; flow:vertical">a line
+    <div id=g1 style="height:10px; margin-bottom:8px"></div><div id=g2 style="height:1*; margin-bottom:6px"></div>
+    <div id=g3 style="height:10px; margin-top:4px"></div></div></body>)");
+  // The line takes 10px, the boxes 20px, the margins 8px and 6px (6 and 4 collapse): 1* is 56px.
+  EXPECT_EQ(Box("#g1"), (Rect{0, 10, 900, 20}));
+  EXPECT_EQ(Box("#g2"), (Rect{0, 28, 900, 84}));
+  EXPECT_EQ(Box("#g3"), (Rect{0, 90, 900, 100}));
+  EXPECT_EQ(Paint().FindText(u"a line")->rect.top, 0);
+}
+
 TEST_F(LayoutTest, PercentageAndFlexibleWidthsShareAHorizontalFlow) {
   Load(R"(<body style="margin:0"><div id=row style="flow:horizontal; width:400px; height:30px">
     <div id=h1 style="width:100px"></div><div id=h2 style="width:1*; height:1*"></div>
     <div id=h3 style="width:2*; height:50%"></div><div id=h4 style="width:10%; margin-left:5px"></div></div></body>)");
   // 10% is 40px and the margin 5px; 255px are left for 1* and 2*.
-  EXPECT_EQ(Box("#h1"), (Rect{0, 0, 100, 0}));
+  EXPECT_EQ(Box("#h1"), (Rect{0, 0, 100, 30}));  // no height of its own: as tall as the row
   EXPECT_EQ(Box("#h2"), (Rect{100, 0, 185, 30}));
   EXPECT_EQ(Box("#h3"), (Rect{185, 0, 355, 15}));
-  EXPECT_EQ(Box("#h4"), (Rect{360, 0, 400, 0}));
+  EXPECT_EQ(Box("#h4"), (Rect{360, 0, 400, 30}));
   std::optional<std::u16string> flow;
   HTMLayoutGetStyleAttribute(Find("#row"), "flow", &flow);
   EXPECT_EQ(flow, u"horizontal");  // what the splitter behavior reads

@@ -135,12 +135,14 @@ class Block final : public Renderer {
     return ResolveWidth(style, contentWidth, insets, shrink ? ShrinkToFit(child, fill, ctx) : fill);
   }
 
+  // A child in the flow: an element, or (element none) one of the container's line segments.
   struct Placed {
     Element* element;
     Edges margins;
     int x;
     int width;
     bool flexible;
+    std::size_t segment = 0;
   };
 
   int LayoutChildren(Element& element, Box& box, const BoxInput& input, const Edges& insets, int contentWidth,
@@ -161,6 +163,7 @@ class Block final : public Renderer {
         const int top = cursor + (first ? 0 : pendingMargin);
         const int height = LayoutLines(element, box, {&element, i, end}, insets, contentWidth, top, ctx);
         if (height > 0) {
+          if (box.extras && !box.extras->segments.empty()) placed.push_back({nullptr, {}, 0, height, false, box.extras->segments.size() - 1});
           cursor = top + height;
           pendingMargin = 0;
           first = false;
@@ -202,9 +205,12 @@ class Block final : public Renderer {
         break;
       }
     }
-    if (flexWeight > 0) cursor = ShareFlexibleHeights(placed, insets, contentWidth, contentCbHeight, flexWeight, flexMinimum, ctx);
+    if (flexWeight > 0) {
+      cursor = ShareFlexibleHeights(placed, box, insets, contentWidth, contentCbHeight, flexWeight, flexMinimum, ctx);
+      pendingMargin = placed.empty() ? 0 : placed.back().margins.bottom;
+    }
     box.Set(kBoxSortedChildren, sorted);
-    if (!placed.empty()) {
+    if (!placed.empty() && placed.back().element) {
       const Box* last = BoxOf(*placed.back().element);
       if (!box.Has(kBoxInlineContent) && last->baseline >= 0) box.baseline = last->y + last->baseline;
     }
@@ -213,19 +219,35 @@ class Block final : public Renderer {
 
   // Flexible heights share what the other children leave of the container's height; then the
   // children are stacked again with their final heights.
-  static int ShareFlexibleHeights(const std::vector<Placed>& placed, const Edges& insets, int contentWidth, int contentCbHeight,
-                                  float weight, int flexMinimum, LayoutContext& ctx) {
+  static int ShareFlexibleHeights(const std::vector<Placed>& placed, Box& box, const Edges& insets, int contentWidth,
+                                  int contentCbHeight, float weight, int flexMinimum, LayoutContext& ctx) {
+    // What the others take, margins collapsed as the stacking below collapses them.
     int used = 0;
+    int pending = 0;
     for (std::size_t k = 0; k < placed.size(); ++k) {
       const Edges& m = placed[k].margins;
-      used += m.top + (k + 1 == placed.size() ? m.bottom : 0);
+      if (!placed[k].element) {
+        used += pending + placed[k].width;
+        pending = 0;
+        continue;
+      }
+      used += k == 0 ? m.top : Collapse(pending, m.top);
       if (!placed[k].flexible) used += BoxOf(*placed[k].element)->height;
+      pending = m.bottom;
     }
+    used += pending;
     int free = std::max(flexMinimum, contentCbHeight - used);
     float remainingWeight = weight;
     int cursor = insets.top;
     int pendingMargin = 0;
     for (std::size_t k = 0; k < placed.size(); ++k) {
+      if (!placed[k].element) {
+        InlineSegment& segment = box.extras->segments[placed[k].segment];
+        segment.y = cursor + (k == 0 ? 0 : pendingMargin);
+        cursor = segment.y + segment.height;
+        pendingMargin = 0;
+        continue;
+      }
       Element& child = *placed[k].element;
       Box* childBox = BoxOf(child);
       const Edges& m = placed[k].margins;

@@ -105,9 +105,12 @@ class Flow final : public Renderer {
         contentHeight = std::max(contentHeight, lines.height);
       } else {
         const ComputedStyle& childStyle = *item.element->style();
-        // A flexible or full height fills the row.
+        // Without a height of its own, or with a flexible one, a child fills the row's height:
+        // panels side by side stand as tall as their row.
         int forced = -1;
-        if (contentCbHeight >= 0 && IsFlexible(childStyle.height)) forced = std::max(0, contentCbHeight - item.margins.vertical());
+        if (contentCbHeight >= 0 && (IsFlexible(childStyle.height) || childStyle.height.unit == Length::Unit::kAuto)) {
+          forced = std::max(0, contentCbHeight - item.margins.vertical());
+        }
         LayoutElement(*item.element, {item.width, forced, contentWidth, contentCbHeight}, ctx);
         Box& child = *BoxOf(*item.element);
         PlaceChild(*item.element, child, x, insets.top + item.margins.top, contentWidth, contentCbHeight);
