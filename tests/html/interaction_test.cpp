@@ -94,6 +94,17 @@ TEST_F(LayoutTest, AScrollBarWidgetStepsAndDragsAndTellsItsOwner) {
   set.pageValue = 10;
   set.stepValue = 1;
   HTMLayoutCallBehaviorMethod(bar, &set);
+  // Each arrow is drawn from its tip (the narrowest line) back: the tips point out of the bar.
+  std::vector<paint::RecordingCanvas::Op> upper, lower;
+  const auto canvas = Paint();
+  for (const auto& op : canvas.ops()) {
+    if (op.kind != paint::RecordingCanvas::Op::Kind::kLine) continue;
+    (op.from.y < 16 ? upper : lower).push_back(op);
+  }
+  ASSERT_GE(upper.size(), 2u);
+  ASSERT_GE(lower.size(), 2u);
+  EXPECT_LT(upper.front().from.y, upper.back().from.y);
+  EXPECT_GT(lower.front().from.y, lower.back().from.y);
   auto& owner = log_.Make("owner");
   HTMLayoutAttachEventHandlerEx(Find("#owner"), &EventLog::Proc, &owner, events::kHandleScroll);
   Press(8, 110);  // the lower arrow

@@ -24,8 +24,8 @@ void Arrow(Canvas& canvas, const Rect& button, bool vertical, bool forward) {
   const int size = std::max(1, std::min(button.width(), button.height()) / 4);
   for (int i = 0; i < size; ++i) {
     const int along = (forward ? 1 : -1) * (size / 2 - i);
-    if (vertical) canvas.DrawLine({cx - i, cy - along}, {cx + i + 1, cy - along}, 1, kArrow);
-    else canvas.DrawLine({cx - along, cy - i}, {cx - along, cy + i + 1}, 1, kArrow);
+    if (vertical) canvas.DrawLine({cx - i, cy + along}, {cx + i + 1, cy + along}, 1, kArrow);
+    else canvas.DrawLine({cx + along, cy - i}, {cx + along, cy + i + 1}, 1, kArrow);
   }
 }
 

@@ -1,6 +1,7 @@
 #include "html/paint/painter.h"
 
 #include <algorithm>
+#include <cmath>
 
 #include "html/controls/control.h"
 #include "html/controls/scroll_bar.h"
@@ -136,8 +137,14 @@ class Painter {
     const Rect area{border.left + b.left, border.top + b.top, border.right - b.right, border.bottom - b.bottom};
     const Size size = image.size;
     if (size.width <= 0 || size.height <= 0 || area.width() <= 0 || area.height() <= 0) return;
-    const int x = area.left + layout::Px(style.backgroundPosition[0], area.width() - size.width);
-    const int y = area.top + layout::Px(style.backgroundPosition[1], area.height() - size.height);
+    // A percentage places that point of the image on the same point of the area, so an image
+    // larger than its area is shifted back (the free space is negative).
+    auto offset = [](const css::Length& position, int freeSpace) {
+      if (position.unit != css::Length::Unit::kPercent) return layout::Px(position, 0);
+      return static_cast<int>(std::lround(double{position.value} * freeSpace / 100.0));
+    };
+    const int x = area.left + offset(style.backgroundPosition[0], area.width() - size.width);
+    const int y = area.top + offset(style.backgroundPosition[1], area.height() - size.height);
     const bool repeatX = style.backgroundRepeat == css::BackgroundRepeat::kRepeat || style.backgroundRepeat == css::BackgroundRepeat::kRepeatX;
     const bool repeatY = style.backgroundRepeat == css::BackgroundRepeat::kRepeat || style.backgroundRepeat == css::BackgroundRepeat::kRepeatY;
     canvas_.PushClip(area);
@@ -278,6 +285,11 @@ class Painter {
   }
 
   void PaintControl(const Element& element, const Rect& content) {
+    if (element.tag() == dom::kAtomImg) {
+      const std::u16string* src = element.Attr(dom::kAtomSrc);
+      if (auto image = src ? view_.context().images().Get(*src) : nullptr) canvas_.DrawImage(*image, content);
+      return;
+    }
     if (PaintToggle(canvas_, element, content)) return;
     const auto* bar = dynamic_cast<const controls::ScrollBar*>(controls::ControlOf(element));
     if (!bar) return;
