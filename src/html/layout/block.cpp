@@ -47,10 +47,7 @@ class Block final : public Renderer {
     const ComputedStyle& style = *element.style();
     const Edges insets = Insets(style, input.cbWidth);
     const int contentWidth = ContentWidth(box, insets);
-    const int specified = input.forcedHeight >= 0 ? input.forcedHeight : SpecifiedHeight(style, input.cbHeight, insets);
-    const ScrollState* scroll = box.scroll();
-    const int barHeight = scroll && scroll->horizontal ? kScrollBarSize : 0;
-    const int contentCbHeight = specified >= 0 ? std::max(0, specified - insets.vertical() - barHeight) : -1;
+    const int contentCbHeight = ChildrenCbHeight(style, box, input, insets);
 
     const auto& nodes = element.nodes();
     const bool allInline = std::all_of(nodes.begin(), nodes.end(), [](const dom::Node* n) {
@@ -65,8 +62,8 @@ class Block final : public Renderer {
       contentHeight = LayoutChildren(element, box, input, insets, contentWidth, contentCbHeight, ctx);
     }
     box.contentHeight = contentHeight;
-    box.height = ResolveHeight(style, input, insets, contentHeight + barHeight);
-    if (!allInline && style.display == css::Display::kTableCell) AlignInCell(element, box, insets, barHeight);
+    box.height = ResolveHeight(style, input, insets, contentHeight + HorizontalBarHeight(box));
+    if (!allInline && style.display == css::Display::kTableCell) AlignInCell(element, box, insets, HorizontalBarHeight(box));
   }
 
   IntrinsicWidths Intrinsic(Element& element, LayoutContext& ctx) const override {

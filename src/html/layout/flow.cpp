@@ -38,17 +38,8 @@ std::vector<Item> ItemsOf(Element& container, LayoutContext* ctx, int cbWidth) {
       continue;
     }
     Element& child = *static_cast<Element*>(nodes[i]);
+    if (LaidApart(child, ctx)) continue;
     const ComputedStyle* style = child.style().get();
-    if (!style) continue;
-    if (style->display == css::Display::kNone) {
-      if (ctx) HideSubtree(child);
-      continue;
-    }
-    if (child.state() & dom::kStatePopup) continue;
-    if (IsOutOfFlow(*style)) {
-      if (ctx) RegisterPositioned(child, 0, 0, *ctx);
-      continue;
-    }
     items.push_back({&child, {}, Margins(*style, cbWidth), 0, IsFlexible(style->width) ? std::max(0.0f, style->width.value) : 0});
   }
   return items;
@@ -60,10 +51,7 @@ class Flow final : public Renderer {
     const ComputedStyle& style = *element.style();
     const Edges insets = Insets(style, input.cbWidth);
     const int contentWidth = ContentWidth(box, insets);
-    const int specified = input.forcedHeight >= 0 ? input.forcedHeight : SpecifiedHeight(style, input.cbHeight, insets);
-    const ScrollState* scroll = box.scroll();
-    const int barHeight = scroll && scroll->horizontal ? kScrollBarSize : 0;
-    const int contentCbHeight = specified >= 0 ? std::max(0, specified - insets.vertical() - barHeight) : -1;
+    const int contentCbHeight = ChildrenCbHeight(style, box, input, insets);
 
     std::vector<Item> items = ItemsOf(element, &ctx, contentWidth);
     // Widths: given ones first, then the content's for auto, then the flexible shares of the rest.
@@ -120,7 +108,7 @@ class Flow final : public Renderer {
       x += item.width + item.margins.right;
     }
     box.contentHeight = contentHeight;
-    box.height = ResolveHeight(style, input, insets, contentHeight + barHeight);
+    box.height = ResolveHeight(style, input, insets, contentHeight + HorizontalBarHeight(box));
   }
 
   IntrinsicWidths Intrinsic(Element& element, LayoutContext& ctx) const override {

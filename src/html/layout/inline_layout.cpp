@@ -74,17 +74,8 @@ void Collect(Element& parent, std::uint32_t first, std::uint32_t end, std::vecto
       continue;
     }
     auto& child = *static_cast<Element*>(node);
+    if (LaidApart(child, ctx)) continue;
     const ComputedStyle* style = child.style().get();
-    if (!style || style->display == css::Display::kNone) {
-      if (ctx) HideSubtree(child);
-      continue;
-    }
-    // Shown popups and positioned elements are laid out apart from the lines.
-    if (child.state() & dom::kStatePopup) continue;
-    if (IsOutOfFlow(*style)) {
-      if (ctx) RegisterPositioned(child, 0, 0, *ctx);
-      continue;
-    }
     if (child.tag() == dom::kAtomBr) {
       items.push_back({ItemKind::kBreak, &child, style, {}, offset});
     } else if (IsAtomic(*style) || child.tag() == dom::kAtomImg || depth >= kMaxInlineDepth) {

@@ -156,29 +156,10 @@ std::vector<PlacedLine> LayoutView::LinesOf(Element& container, PlaceMode mode) 
   Box* box = LiveBox(container);
   if (!box || !box->Has(kBoxInlineContent)) return {};
   ctx_.ForgetStyles();
-  const Edges insets = Insets(*container.style(), box->cbWidth);
-  if (!box->extras || box->extras->segments.empty()) {
-    const Point origin = LinesOrigin(container, *box);
-    std::vector<PlacedLine> lines = InlineLayout::Place(
-        {&container, 0, static_cast<std::uint32_t>(container.nodes().size())}, ContentWidth(*box, insets), origin, mode, ctx_);
-    for (PlacedLine& line : lines) {
-      line.top += origin.y;
-      line.baseline += origin.y;
-      for (PlacedRun& run : line.runs) {
-        run.x += origin.x;
-        if (run.kind == PlacedRun::Kind::kText) run.top += origin.y;
-      }
-      for (InlineFragment& f : line.fragments) {
-        f.left += origin.x;
-        f.right += origin.x;
-      }
-    }
-    return lines;
-  }
+  // Lines are placed from their segment's origin and answered in the view's terms.
   std::vector<PlacedLine> all;
-  for (const InlineSegment& segment : box->extras->segments) {
-    const Point origin{segment.x, segment.y};
-    for (PlacedLine& line : InlineLayout::Place({&container, segment.firstNode, segment.endNode}, segment.width, origin, mode, ctx_)) {
+  auto place = [&](const InlineRange& range, int width, Point origin) {
+    for (PlacedLine& line : InlineLayout::Place(range, width, origin, mode, ctx_)) {
       line.top += origin.y;
       line.baseline += origin.y;
       for (PlacedRun& run : line.runs) {
@@ -190,6 +171,15 @@ std::vector<PlacedLine> LayoutView::LinesOf(Element& container, PlaceMode mode) 
         f.right += origin.x;
       }
       all.push_back(std::move(line));
+    }
+  };
+  if (!box->extras || box->extras->segments.empty()) {
+    const Edges insets = Insets(*container.style(), box->cbWidth);
+    place({&container, 0, static_cast<std::uint32_t>(container.nodes().size())}, ContentWidth(*box, insets),
+          LinesOrigin(container, *box));
+  } else {
+    for (const InlineSegment& segment : box->extras->segments) {
+      place({&container, segment.firstNode, segment.endNode}, segment.width, {segment.x, segment.y});
     }
   }
   return all;

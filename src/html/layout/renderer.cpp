@@ -233,6 +233,30 @@ int SpecifiedHeight(const ComputedStyle& style, int cbHeight, const Edges& inset
   return style.boxSizing == css::BoxSizing::kBorderBox ? std::max(value, insets.vertical()) : value + insets.vertical();
 }
 
+int HorizontalBarHeight(const Box& box) {
+  const ScrollState* scroll = box.scroll();
+  return scroll && scroll->horizontal ? kScrollBarSize : 0;
+}
+
+int ChildrenCbHeight(const ComputedStyle& style, const Box& box, const BoxInput& input, const Edges& insets) {
+  const int specified = input.forcedHeight >= 0 ? input.forcedHeight : SpecifiedHeight(style, input.cbHeight, insets);
+  return specified >= 0 ? std::max(0, specified - insets.vertical() - HorizontalBarHeight(box)) : -1;
+}
+
+bool LaidApart(Element& child, LayoutContext* ctx) {
+  const ComputedStyle* style = child.style().get();
+  if (!style || style->display == css::Display::kNone) {
+    if (ctx) HideSubtree(child);
+    return true;
+  }
+  if (child.state() & dom::kStatePopup) return true;
+  if (IsOutOfFlow(*style)) {
+    if (ctx) RegisterPositioned(child, 0, 0, *ctx);
+    return true;
+  }
+  return false;
+}
+
 int ResolveHeight(const ComputedStyle& style, const BoxInput& input, const Edges& insets, int contentHeight) {
   if (input.forcedHeight >= 0) return input.forcedHeight;
   int height = SpecifiedHeight(style, input.cbHeight, insets);

@@ -38,6 +38,16 @@ int SpecifiedHeight(const css::ComputedStyle& style, int cbHeight, const Edges& 
 
 // The width content can use: the border box less insets and a vertical scroll bar.
 int ContentWidth(const Box& box, const Edges& insets);
+// The height of the box's horizontal scroll bar, 0 when it has none.
+int HorizontalBarHeight(const Box& box);
+// The height the children's percentages and flexible heights share: the forced or definite
+// height less insets and a horizontal scroll bar; -1 when the height comes from the content.
+int ChildrenCbHeight(const css::ComputedStyle& style, const Box& box, const BoxInput& input, const Edges& insets);
+
+// Whether a child takes no place among its siblings: not shown (its subtree is then marked so),
+// a shown popup, or positioned out of flow (registered to be placed by its containing block).
+// Without a context nothing is marked or registered.
+bool LaidApart(Element& child, LayoutContext* ctx);
 
 // Puts a laid-out child at (x, y) of its parent's border box, with its relative offset.
 void PlaceChild(Element& child, Box& box, int x, int y, int cbWidth, int cbHeight);
