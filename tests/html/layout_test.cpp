@@ -98,6 +98,17 @@ TEST_F(LayoutTest, FlexibleHeightsLeaveRoomForLinesAndCollapsedMargins) {
   EXPECT_EQ(Paint().FindText(u"a line")->rect.top, 0);
 }
 
+TEST_F(LayoutTest, APaintCoversItsAreaWithTheWindowsWhiteFirst) {
+  Load(R"(<body style="margin:0">no background</body>)");
+  // Canvases keep what was drawn before: a page without a background must not show it.
+  const auto canvas = Paint({10, 20, 110, 70});
+  ASSERT_FALSE(canvas.ops().empty());
+  const auto& first = canvas.ops().front();
+  EXPECT_EQ(first.kind, paint::RecordingCanvas::Op::Kind::kFillRect);
+  EXPECT_EQ(first.rect, (Rect{10, 20, 110, 70}));
+  EXPECT_EQ(first.color, 0xFFFFFFFFu);
+}
+
 TEST_F(LayoutTest, PercentageAndFlexibleWidthsShareAHorizontalFlow) {
   Load(R"(<body style="margin:0"><div id=row style="flow:horizontal; width:400px; height:30px">
     <div id=h1 style="width:100px"></div><div id=h2 style="width:1*; height:1*"></div>

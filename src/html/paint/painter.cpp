@@ -26,6 +26,8 @@ Rect Intersect(const Rect& a, const Rect& b) {
   return r;
 }
 
+constexpr Color kWindowBackground = 0xFFFFFFFF;
+
 bool Meets(const Rect& a, const Rect& b) { return a.left < b.right && b.left < a.right && a.top < b.bottom && b.top < a.bottom; }
 
 Radii RadiiOf(const ComputedStyle& style, const Rect& box) {
@@ -54,6 +56,9 @@ class Painter {
     Element* root = view_.document().root();
     if (!root || !LiveBox(*root)) return;
     canvas_.PushClip(area);
+    // The window's own white under pages that paint no background: what was drawn before
+    // must not show through.
+    canvas_.FillRect(area, kWindowBackground);
     PaintElement(*root, {0, 0}, area);
     for (const layout::PopupPlacement& popup : view_.popups()) {
       if (const Box* box = LiveBox(*popup.popup)) PaintElement(*popup.popup, {box->x, box->y}, area);
