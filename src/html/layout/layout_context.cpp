@@ -20,15 +20,19 @@ void LayoutContext::BeginPass(Size viewSize) {
 
 LayoutContext::FontEntry& LayoutContext::EntryOf(const css::ComputedStyle& style) {
   if (&style == lastStyle_) return *lastEntry_;
-  Font font = FontOf(style);
-  auto found = fonts_.find(font);
-  if (found == fonts_.end()) {
-    FontEntry entry{font, measurer_.Metrics(font), -1};
-    found = fonts_.emplace(std::move(font), std::move(entry)).first;
+  FontEntry*& known = byStyle_[&style];
+  if (!known) {
+    Font font = FontOf(style);
+    auto found = fonts_.find(font);
+    if (found == fonts_.end()) {
+      FontEntry entry{font, measurer_.Metrics(font), -1};
+      found = fonts_.emplace(std::move(font), std::move(entry)).first;
+    }
+    known = &found->second;
   }
   lastStyle_ = &style;
-  lastEntry_ = &found->second;
-  return found->second;
+  lastEntry_ = known;
+  return *known;
 }
 
 const FontMetrics& LayoutContext::MetricsOf(const css::ComputedStyle& style) { return EntryOf(style).metrics; }

@@ -35,8 +35,8 @@ class LayoutContext {
   ImageCache& images() { return images_; }
   Size view;
 
-  // Font metrics and space width of a style's font (styles are shared, so a one-entry memo
-  // makes a table's cells cheap).
+  // Font metrics and space width of a style's font (styles are shared, so a memo by style
+  // makes a table's cells cheap: no font is built or hashed per cell).
   const FontMetrics& MetricsOf(const css::ComputedStyle& style);
   int SpaceWidth(const css::ComputedStyle& style);
   // The style's line height and its half-leading, in px.
@@ -58,6 +58,7 @@ class LayoutContext {
   void ForgetStyles() {
     lastStyle_ = nullptr;
     lastEntry_ = nullptr;
+    byStyle_.clear();
   }
 
  private:
@@ -71,6 +72,7 @@ class LayoutContext {
   const TextMeasurer& measurer_;
   ImageCache& images_;
   std::unordered_map<Font, FontEntry, FontHash> fonts_;
+  std::unordered_map<const css::ComputedStyle*, FontEntry*> byStyle_;
   const css::ComputedStyle* lastStyle_ = nullptr;
   FontEntry* lastEntry_ = nullptr;
 };
