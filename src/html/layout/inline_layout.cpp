@@ -125,8 +125,7 @@ Extent TextExtent(const ComputedStyle& style, LayoutContext& ctx) {
 class LineBuilder {
  public:
   LineBuilder(Element& container, int width, bool measure, bool place, PlaceMode mode, Point origin, LayoutContext& ctx)
-      : container_(container),
-        style_(*container.style()),
+      : style_(*container.style()),
         width_(width),
         measure_(measure),
         place_(place),
@@ -419,7 +418,6 @@ class LineBuilder {
     PlaceChild(*a.element, *a.box, origin_.x + a.x + shift + a.margins.left, origin_.y + y + a.margins.top, width_, -1);
   }
 
-  Element& container_;
   const ComputedStyle& style_;
   int width_;
   bool measure_;
