@@ -2,34 +2,6 @@
 
 namespace kestrune::itunesdb {
 
-RecordShape ShapeOf(std::uint32_t tag) {
-  switch (tag) {
-    case kTagMhbd:
-    case kTagMhfd:
-      return {RecordKind::kList, 20};
-    case kTagMhlt:
-    case kTagMhlp:
-    case kTagMhli:
-    case kTagMhla:
-    case kTagMhlf:
-      return {RecordKind::kList, 8};
-    case kTagMhsd:
-    case kTagMhit:
-    case kTagMhyp:
-    case kTagMhip:
-    case kTagMhii:
-    case kTagMhni:
-    case kTagMhba:
-    case kTagMhia:
-    case kTagMhif:
-      return {RecordKind::kLength, 0};
-    case kTagMhod:
-      return {RecordKind::kString, 0};
-    default:
-      return {RecordKind::kUnknown, 0};
-  }
-}
-
 std::string TagText(std::uint32_t tag) {
   std::string text;
   for (int i = 0; i < 4; ++i) {

@@ -56,8 +56,35 @@ struct RecordShape {
   std::size_t countOffset = 0;  // list kind only
 };
 
-// The kind of a tag, tested against the 17 known tags in their table order.
-RecordShape ShapeOf(std::uint32_t tag);
+// The kind of a tag, tested against the 17 known tags (they are distinct, so the order of the
+// tests does not matter).
+constexpr RecordShape ShapeOf(std::uint32_t tag) {
+  switch (tag) {
+    case kTagMhbd:
+    case kTagMhfd:
+      return {RecordKind::kList, 20};
+    case kTagMhlt:
+    case kTagMhlp:
+    case kTagMhli:
+    case kTagMhla:
+    case kTagMhlf:
+      return {RecordKind::kList, 8};
+    case kTagMhsd:
+    case kTagMhit:
+    case kTagMhyp:
+    case kTagMhip:
+    case kTagMhii:
+    case kTagMhni:
+    case kTagMhba:
+    case kTagMhia:
+    case kTagMhif:
+      return {RecordKind::kLength, 0};
+    case kTagMhod:
+      return {RecordKind::kString, 0};
+    default:
+      return {RecordKind::kUnknown, 0};
+  }
+}
 
 // Common header and the fields the library reads.
 inline constexpr std::size_t kTagOffset = 0;

@@ -68,9 +68,8 @@ bool ReadMhodText(const DbChunk& node, std::uint32_t type, std::u16string& text)
 }
 
 std::u16string FormatLength(std::uint32_t milliseconds) {
-  const std::uint32_t minutes = milliseconds / 60000;
   const std::uint32_t seconds = (milliseconds / 1000) % 60;
-  std::u16string text = FormatDecimal(minutes);
+  std::u16string text = FormatDecimal(milliseconds / 60000);
   text += u':';
   text += static_cast<char16_t>(u'0' + seconds / 10);
   text += static_cast<char16_t>(u'0' + seconds % 10);

@@ -140,8 +140,10 @@ DeviceDescription GeneratedDevice(const GeneratedDeviceOptions& options) {
     const std::uint32_t artist = random.Below(artists);
     track.artist = U(kWords[artist % kWords.size()]) + u" " +
                    U(kNouns[artist / kWords.size() % kNouns.size()]) + u" " + FormatDecimal(artist);
-    track.album = U(random.Pick(kNouns)) + u" of " + U(random.Pick(kWords)) + u" " +
-                  FormatDecimal(artist * 4 + random.Below(4));
+    // Each artist has up to four albums, each always under the same name.
+    const std::uint32_t album = artist * 4 + random.Below(4);
+    track.album = U(kNouns[album % kNouns.size()]) + u" of " +
+                  U(kWords[album / kNouns.size() % kWords.size()]) + u" " + FormatDecimal(album);
     track.genre = U(random.Pick(kGenres));
     track.location = LocationFor(i, u".mp3");
     track.lengthMs = 90000 + random.Below(330000);
@@ -157,8 +159,10 @@ DeviceDescription GeneratedDevice(const GeneratedDeviceOptions& options) {
     PlaylistDescription playlist;
     playlist.name = U(random.Pick(kWords)) + u" Mix " + FormatDecimal(std::uint64_t{p + 1});
     playlist.positions = true;
+    // Sizes from a handful to 1,400 tracks: with 40,000 tracks and 50 playlists the database
+    // comes to about 60 MB, as real databases of devices that size do.
     const std::uint32_t count =
-        options.tracks == 0 ? 0 : 10 + random.Below(std::min(2000u, options.tracks));
+        options.tracks == 0 ? 0 : 10 + random.Below(std::min(1400u, options.tracks));
     for (std::uint32_t k = 0; k < count; ++k)
       playlist.itemIds.push_back(1000 + random.Below(options.tracks));
     device.playlists.push_back(std::move(playlist));
