@@ -39,6 +39,32 @@ TEST_F(LayoutTest, ScrollBarsStepPageAndDragAndTheWheelScrollsWhatIsUnderIt) {
   EXPECT_EQ(log_.entries.back(), "list:8:" + std::to_string(events::kScrollStepPlus));
 }
 
+TEST_F(LayoutTest, ABoxThatHidesItsOverflowHasNoBarsButTheProgramScrollsIt) {
+  Load(R"(<body style="margin:0; font-size:10px">
+    <div id=clip style="width:200px; height:100px; overflow:hidden"><div style="height:30px">top</div>
+      <div id=deep style="height:1000px">deep</div></div></body>)");
+  Size content{};
+  Rect view{};
+  HTMLayoutGetScrollInfo(Find("#clip"), nullptr, &view, &content);
+  EXPECT_EQ(content, (Size{200, 1030}));
+  EXPECT_EQ(view.width(), 200);  // no room taken by bars
+  HTMLayoutMouseInput(window_, {events::kMouseWheel, {50, 50}, 0, 0, nullptr, -2});
+  EXPECT_EQ(ScrollPosition("#clip"), (Point{0, 0}));  // the wheel scrolls only what shows bars
+
+  HTMLayoutSetScrollPos(Find("#clip"), {0, 40}, false);
+  EXPECT_EQ(ScrollPosition("#clip"), (Point{0, 40}));
+  EXPECT_EQ(Paint().FindText(u"top"), nullptr);
+  // The position outlives a relayout, and the end of the content is as far as it goes.
+  HTMLayoutSetStyleAttribute(Find("#clip"), "width", u"150px");
+  EXPECT_EQ(ScrollPosition("#clip"), (Point{0, 40}));
+  HTMLayoutSetScrollPos(Find("#clip"), {0, 5000}, false);
+  EXPECT_EQ(ScrollPosition("#clip"), (Point{0, 930}));
+  HTMLayoutSetScrollPos(Find("#clip"), {0, 0}, false);
+  HTMLayoutSetStyleAttribute(Find("#clip"), "width", u"200px");
+  EXPECT_EQ(ScrollPosition("#clip"), (Point{0, 0}));
+  EXPECT_NE(Paint().FindText(u"top"), nullptr);
+}
+
 TEST_F(LayoutTest, ASmoothScrollIsPaintedOnItsWayWhileGeometryAnswersWhereItGoes) {
   Load(kScrollPage);
   HTMLayoutSetScrollPos(Find("#list"), {0, 500}, true);

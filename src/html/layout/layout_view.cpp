@@ -193,7 +193,7 @@ Point LayoutView::ShownScroll(const Box& box) const {
 bool LayoutView::ScrollTo(Element& element, Point position, bool smooth) {
   Box* box = LiveBox(element);
   if (!box) return false;
-  ScrollState* scroll = box->scroll();
+  ScrollState* scroll = ScrollStateFor(element, *box);
   if (!scroll) return true;  // nothing to scroll: the position stays (0, 0)
   const Rect view = ScrollViewport(element, *box);
   position.x = std::clamp(position.x, 0, std::max(0, scroll->content.width - view.width()));
@@ -208,6 +208,15 @@ bool LayoutView::ScrollTo(Element& element, Point position, bool smooth) {
   }
   DamageElement(element);
   return true;
+}
+
+ScrollState* LayoutView::ScrollStateFor(const Element& element, Box& box) {
+  if (box.scroll() || !box.Has(kBoxScroller)) return box.scroll();
+  ScrollState& scroll = box.Extras().scroll.emplace();
+  const Size extent = ScrollableExtent(element, box);
+  const Rect view = ScrollViewport(element, box);
+  scroll.content = {std::max(extent.width, view.width()), std::max(extent.height, view.height())};
+  return &scroll;
 }
 
 bool LayoutView::Animate(Clock::time_point now) {
@@ -352,7 +361,10 @@ std::optional<events::ScrollInfo> LayoutView::GetScrollInfo(Element& element) {
   if (!box) return std::nullopt;
   const Rect view = ScrollViewport(element, *box);
   if (const ScrollState* scroll = box->scroll()) return events::ScrollInfo{scroll->position, view, scroll->content};
-  return events::ScrollInfo{{}, view, {view.width(), view.height()}};
+  if (!box->Has(kBoxScroller)) return events::ScrollInfo{{}, view, {view.width(), view.height()}};
+  // A clipping box never scrolled: at the origin, over all of its content.
+  const Size extent = ScrollableExtent(element, *box);
+  return events::ScrollInfo{{}, view, {std::max(extent.width, view.width()), std::max(extent.height, view.height())}};
 }
 
 bool LayoutView::ScrollToView(Element& element, bool toTop, bool smooth) {
@@ -361,7 +373,7 @@ bool LayoutView::ScrollToView(Element& element, bool toTop, bool smooth) {
   if (!rect) return false;
   for (Element* up = element.parent(); up; up = up->parent()) {
     Box* box = LiveBox(*up);
-    ScrollState* scroll = box ? box->scroll() : nullptr;
+    ScrollState* scroll = box ? ScrollStateFor(*up, *box) : nullptr;
     if (!scroll) continue;
     const auto origin = OriginInView(*up);
     if (!origin) break;

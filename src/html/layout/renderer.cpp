@@ -67,6 +67,19 @@ Size ContentExtent(const Element& element, const Box& box, const Edges& border, 
   return {right, bottom};
 }
 
+// Whether the box keeps a scroll state through layout: the root, boxes with scroll bars, and
+// clipping boxes the program has scrolled. A clipping box at (0, 0), like every cell of a table
+// whose cells hide what overflows them, lays out as a plain box that clips; it gets its state
+// when it is first scrolled (LayoutView::ScrollStateFor).
+bool NeedsScrollState(const Element& element, const ComputedStyle& style, const Box& box) {
+  if (element.parent() == nullptr) return true;
+  if (!Clips(style)) return false;
+  const bool bars = style.overflowX == Overflow::kAuto || style.overflowX == Overflow::kScroll ||
+                    style.overflowY == Overflow::kAuto || style.overflowY == Overflow::kScroll;
+  const ScrollState* scroll = box.scroll();
+  return bars || (scroll && (scroll->position != Point{} || scroll->shown != Point{}));
+}
+
 void LayoutScroller(Element& element, Box& box, const BoxInput& input, LayoutContext& ctx) {
   const ComputedStyle& style = *element.style();
   const Renderer& renderer = RendererFor(element);
@@ -131,6 +144,11 @@ void LayoutScroller(Element& element, Box& box, const BoxInput& input, LayoutCon
 
 }  // namespace
 
+Size ScrollableExtent(const Element& element, const Box& box) {
+  const ComputedStyle& style = *element.style();
+  return ContentExtent(element, box, BorderWidths(style), Padding(style, box.cbWidth));
+}
+
 void HideSubtree(Element& element) {
   for (Element* e = &element; e; e = dom::NextElementInOrder(e, &element)) {
     if (Box* box = BoxOf(*e)) box->flags = kBoxHidden;
@@ -164,11 +182,12 @@ void LayoutElement(Element& element, const BoxInput& input, LayoutContext& ctx) 
   const bool container = element.parent() == nullptr || style.position != css::Position::kStatic;
   if (container) ctx.positionedContainers.push_back(&element);
   ++ctx.depth;
-  if (Clips(style) || element.parent() == nullptr) {
+  if (NeedsScrollState(element, style, box)) {
     LayoutScroller(element, box, input, ctx);
   } else {
     if (box.extras) box.extras->scroll.reset();
     RendererFor(element).Layout(element, box, input, ctx);
+    box.Set(kBoxScroller, Clips(style));
   }
   --ctx.depth;
   if (container) {

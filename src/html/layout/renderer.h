@@ -21,6 +21,8 @@ const Renderer& RendererFor(const Element& element);
 void LayoutElement(Element& element, const BoxInput& input, LayoutContext& ctx);
 // Intrinsic widths of the element's border box (margins not included), cached for the pass.
 IntrinsicWidths IntrinsicOf(Element& element, LayoutContext& ctx);
+// The extent of a laid-out element's content from its padding box origin: what it scrolls.
+Size ScrollableExtent(const Element& element, const Box& box);
 // Marks an element and its subtree as not shown (display: none, or nested too deeply).
 void HideSubtree(Element& element);
 
