@@ -30,7 +30,12 @@ std::pmr::unsynchronized_pool_resource& BoxMemory() {
 
 constexpr int kMaxPx = 1 << 24;  // lengths stay far from int overflow when summed
 
-int Round(double value) { return static_cast<int>(std::lround(std::clamp(value, -double{kMaxPx}, double{kMaxPx}))); }
+// Halves round away from zero, as lround does, without the library call: a table asks for
+// every cell's paddings more than once.
+int Round(double value) {
+  const double v = std::clamp(value, -double{kMaxPx}, double{kMaxPx});
+  return static_cast<int>(v < 0 ? v - 0.5 : v + 0.5);
+}
 
 bool Drawn(const css::Border& border) {
   return border.style != css::BorderStyle::kNone && border.style != css::BorderStyle::kHidden;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <climits>
+#include <optional>
 
 #include "html/controls/control.h"
 #include "html/dom/states.h"
@@ -216,7 +217,7 @@ class LineBuilder {
         EndLine();
       }
     }
-    const Extent extent = TextExtent(*item.style, ctx_);
+    const Extent extent = ExtentOf(*item.style);
     extent_.top = std::min(extent_.top, extent.top);
     extent_.bottom = std::max(extent_.bottom, extent.bottom);
     hasContent_ = true;
@@ -418,6 +419,15 @@ class LineBuilder {
     PlaceChild(*a.element, *a.box, origin_.x + a.x + shift + a.margins.left, origin_.y + y + a.margins.top, width_, -1);
   }
 
+  // The text extent of the last style asked for: the words of a run share it.
+  Extent ExtentOf(const ComputedStyle& style) {
+    if (&style != extentStyle_) {
+      extentStyle_ = &style;
+      lastExtent_ = TextExtent(style, ctx_);
+    }
+    return lastExtent_;
+  }
+
   const ComputedStyle& style_;
   int width_;
   bool measure_;
@@ -426,6 +436,8 @@ class LineBuilder {
   Point origin_;
   LayoutContext& ctx_;
   Extent strut_;
+  const ComputedStyle* extentStyle_ = nullptr;
+  Extent lastExtent_;
 
   int x_ = 0;
   bool hasContent_ = false;
@@ -446,9 +458,32 @@ bool AnyWraps(const std::vector<Item>& items) {
   });
 }
 
+// The lines of a container holding nothing but text that never wraps nor breaks (the cells of
+// a big table, mostly): one line in the container's own font. What the builder would find,
+// without items or a builder; text of white space alone is left to the builder.
+std::optional<LinesSize> UnwrappedTextLine(const InlineRange& range, LayoutContext& ctx) {
+  const Element& container = *range.container;
+  const auto& nodes = container.nodes();
+  const ComputedStyle* style = container.style().get();
+  if (!style || style->whiteSpace != WhiteSpace::kNoWrap || nodes.empty() || range.firstNode != 0 ||
+      range.endNode < nodes.size()) {
+    return std::nullopt;
+  }
+  bool shows = false;
+  for (const dom::Node* node : nodes) {
+    if (node->IsElement()) return std::nullopt;
+    const std::u16string_view text = static_cast<const dom::Text*>(node)->text();
+    shows = shows || std::any_of(text.begin(), text.end(), [](char16_t c) { return !IsSpace(c); });
+  }
+  if (!shows) return std::nullopt;
+  const Extent extent = TextExtent(*style, ctx);
+  return LinesSize{extent.bottom - extent.top, -extent.top, 0};
+}
+
 }  // namespace
 
 LinesSize InlineLayout::Measure(const InlineRange& range, int width, LayoutContext& ctx) {
+  if (const std::optional<LinesSize> line = UnwrappedTextLine(range, ctx)) return *line;
   const std::vector<Item> items = ItemsOf(range, &ctx);
   LineBuilder builder(*range.container, width, AnyWraps(items), false, PlaceMode::kPaint, {}, ctx);
   builder.Run(items);

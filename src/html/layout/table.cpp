@@ -269,6 +269,7 @@ class Table final : public Renderer {
     y += spacing;
     Element* group = nullptr;
     int groupTop = 0;
+    std::vector<std::pair<Element*, int>> cells;  // a row's, reused from row to row
     auto closeGroup = [&](int bottom) {
       if (!group) return;
       Box& groupBox = EnsureBox(*group);
@@ -288,7 +289,7 @@ class Table final : public Renderer {
       }
       const int originX = row.group ? 0 : insets.left;
       const int originY = row.group ? groupTop : 0;
-      const int height = LayoutRow(*row.element, widths, spacing, contentWidth, sameColumns, ctx);
+      const int height = LayoutRow(*row.element, widths, spacing, contentWidth, sameColumns, cells, ctx);
       Box& rowBox = *BoxOf(*row.element);
       PlaceChild(*row.element, rowBox, originX, y - originY, contentWidth, -1);
       rowBox.Set(kBoxPinned, scrolls && row.header);
@@ -323,7 +324,7 @@ class Table final : public Renderer {
  private:
   // Lays the row's cells out in their columns; a row that did not change keeps its boxes.
   static int LayoutRow(Element& row, const std::vector<int>& widths, int spacing, int width, bool sameColumns,
-                       LayoutContext& ctx) {
+                       std::vector<std::pair<Element*, int>>& cells, LayoutContext& ctx) {
     Box& rowBox = EnsureBox(row);
     if (sameColumns && !(row.dirty() & (dom::kLayoutDirty | dom::kChildLayoutDirty)) && !rowBox.Has(kBoxHidden) &&
         rowBox.width == width && rowBox.cbWidth == width) {
@@ -336,7 +337,7 @@ class Table final : public Renderer {
     int height = std::max(0, Px(style.height, -1, 0));
     int x = spacing;
     std::size_t column = 0;
-    std::vector<std::pair<Element*, int>> cells;  // with their widths
+    cells.clear();  // with their widths
     ForEachCell(row, &ctx, [&](Element& cell) {
       const std::size_t span = std::min<std::size_t>(static_cast<std::size_t>(Span(cell)), widths.size() - std::min(column, widths.size()));
       int cellWidth = 0;
