@@ -67,8 +67,13 @@ std::u16string DecodeUtf8(std::string_view bytes) {
   while (i < size) {
     const auto lead = static_cast<unsigned char>(bytes[i]);
     if (lead < 0x80) {
-      out.push_back(lead);
-      ++i;
+      // A run of ASCII, the bulk of any page, widened in one go.
+      std::size_t end = i + 1;
+      while (end < size && static_cast<unsigned char>(bytes[end]) < 0x80) ++end;
+      const std::size_t at = out.size();
+      out.resize(at + (end - i));
+      for (std::size_t k = i; k < end; ++k) out[at + (k - i)] = static_cast<unsigned char>(bytes[k]);
+      i = end;
       continue;
     }
     std::size_t length = 0;
