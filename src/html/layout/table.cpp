@@ -42,21 +42,6 @@ Length WidthOf(const Element& element) {
   return width;
 }
 
-bool Skipped(Element& element, LayoutContext* ctx) {
-  const ComputedStyle* style = element.style().get();
-  if (!style) return true;
-  if (style->display == Display::kNone) {
-    if (ctx) HideSubtree(element);
-    return true;
-  }
-  if (element.state() & dom::kStatePopup) return true;
-  if (IsOutOfFlow(*style)) {
-    if (ctx) RegisterPositioned(element, 0, 0, *ctx);
-    return true;
-  }
-  return false;
-}
-
 struct Row {
   Element* element;
   Element* group;  // its row group, or none
@@ -80,7 +65,7 @@ Structure StructureOf(Element& table, LayoutContext* ctx) {
   };
   for (dom::Node* node : table.nodes()) {
     Element* child = dom::AsElement(node);
-    if (!child || Skipped(*child, ctx)) continue;
+    if (!child || LaidApart(*child, ctx)) continue;
     const Display display = child->style()->display;
     if (display == Display::kTableCaption) {
       if (!s.caption) s.caption = child;
@@ -91,7 +76,7 @@ Structure StructureOf(Element& table, LayoutContext* ctx) {
       s.groups.push_back(child);
       for (dom::Node* inner : child->nodes()) {
         Element* row = dom::AsElement(inner);
-        if (!row || Skipped(*row, ctx)) continue;
+        if (!row || LaidApart(*row, ctx)) continue;
         if (row->tag() == dom::kAtomCol) s.columns.push_back(row);
         else addRow(*row, child, display == Display::kTableHeaderGroup);
       }
@@ -106,7 +91,7 @@ template <typename F>
 void ForEachCell(Element& row, LayoutContext* ctx, F&& f) {
   for (dom::Node* node : row.nodes()) {
     Element* cell = dom::AsElement(node);
-    if (cell && !Skipped(*cell, ctx)) f(*cell);
+    if (cell && !LaidApart(*cell, ctx)) f(*cell);
   }
 }
 
