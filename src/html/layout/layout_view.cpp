@@ -32,6 +32,13 @@ bool IsLayoutBoundary(const Element& element) {
   return definite(style->width) && definite(style->height);
 }
 
+// What a box scrolls over: all of its content, and never less than its viewport.
+Size ScrollRange(const Element& element, const Box& box) {
+  const Size extent = ScrollableExtent(element, box);
+  const Rect view = ScrollViewport(element, box);
+  return {std::max(extent.width, view.width()), std::max(extent.height, view.height())};
+}
+
 }  // namespace
 
 LayoutView::LayoutView(dom::Document& document, const TextMeasurer& measurer, ImageSource& images)
@@ -213,9 +220,7 @@ bool LayoutView::ScrollTo(Element& element, Point position, bool smooth) {
 ScrollState* LayoutView::ScrollStateFor(const Element& element, Box& box) {
   if (box.scroll() || !box.Has(kBoxScroller)) return box.scroll();
   ScrollState& scroll = box.Extras().scroll.emplace();
-  const Size extent = ScrollableExtent(element, box);
-  const Rect view = ScrollViewport(element, box);
-  scroll.content = {std::max(extent.width, view.width()), std::max(extent.height, view.height())};
+  scroll.content = ScrollRange(element, box);
   return &scroll;
 }
 
@@ -362,9 +367,7 @@ std::optional<events::ScrollInfo> LayoutView::GetScrollInfo(Element& element) {
   const Rect view = ScrollViewport(element, *box);
   if (const ScrollState* scroll = box->scroll()) return events::ScrollInfo{scroll->position, view, scroll->content};
   if (!box->Has(kBoxScroller)) return events::ScrollInfo{{}, view, {view.width(), view.height()}};
-  // A clipping box never scrolled: at the origin, over all of its content.
-  const Size extent = ScrollableExtent(element, *box);
-  return events::ScrollInfo{{}, view, {std::max(extent.width, view.width()), std::max(extent.height, view.height())}};
+  return events::ScrollInfo{{}, view, ScrollRange(element, *box)};  // a clipping box never scrolled
 }
 
 bool LayoutView::ScrollToView(Element& element, bool toTop, bool smooth) {
