@@ -7,7 +7,6 @@
 #include <malloc.h>
 
 #include <cstdio>
-
 #include <string>
 
 #include "html/api/htmlayout.h"

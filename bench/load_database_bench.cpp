@@ -4,8 +4,8 @@
 #include <cstdio>
 #include <cstring>
 #include <fstream>
-#include <memory>
 #include <iostream>
+#include <memory>
 #include <string>
 
 #include "base/paths.h"

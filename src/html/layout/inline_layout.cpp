@@ -217,7 +217,7 @@ class LineBuilder {
         EndLine();
       }
     }
-    const Extent extent = ExtentOf(*item.style);
+    const Extent extent = TextExtent(*item.style, ctx_);
     extent_.top = std::min(extent_.top, extent.top);
     extent_.bottom = std::max(extent_.bottom, extent.bottom);
     hasContent_ = true;
@@ -419,15 +419,6 @@ class LineBuilder {
     PlaceChild(*a.element, *a.box, origin_.x + a.x + shift + a.margins.left, origin_.y + y + a.margins.top, width_, -1);
   }
 
-  // The text extent of the last style asked for: the words of a run share it.
-  Extent ExtentOf(const ComputedStyle& style) {
-    if (&style != extentStyle_) {
-      extentStyle_ = &style;
-      lastExtent_ = TextExtent(style, ctx_);
-    }
-    return lastExtent_;
-  }
-
   const ComputedStyle& style_;
   int width_;
   bool measure_;
@@ -436,8 +427,6 @@ class LineBuilder {
   Point origin_;
   LayoutContext& ctx_;
   Extent strut_;
-  const ComputedStyle* extentStyle_ = nullptr;
-  Extent lastExtent_;
 
   int x_ = 0;
   bool hasContent_ = false;

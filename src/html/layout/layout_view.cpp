@@ -39,6 +39,14 @@ Size ScrollRange(const Element& element, const Box& box) {
   return {std::max(extent.width, view.width()), std::max(extent.height, view.height())};
 }
 
+// The box's scroll state; a clipping box laid out without one (never scrolled) gets it now.
+ScrollState* ScrollStateFor(const Element& element, Box& box) {
+  if (box.scroll() || !box.Has(kBoxScroller)) return box.scroll();
+  ScrollState& scroll = box.Extras().scroll.emplace();
+  scroll.content = ScrollRange(element, box);
+  return &scroll;
+}
+
 }  // namespace
 
 LayoutView::LayoutView(dom::Document& document, const TextMeasurer& measurer, ImageSource& images)
@@ -215,13 +223,6 @@ bool LayoutView::ScrollTo(Element& element, Point position, bool smooth) {
   }
   DamageElement(element);
   return true;
-}
-
-ScrollState* LayoutView::ScrollStateFor(const Element& element, Box& box) {
-  if (box.scroll() || !box.Has(kBoxScroller)) return box.scroll();
-  ScrollState& scroll = box.Extras().scroll.emplace();
-  scroll.content = ScrollRange(element, box);
-  return &scroll;
 }
 
 bool LayoutView::Animate(Clock::time_point now) {

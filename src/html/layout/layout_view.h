@@ -103,8 +103,6 @@ class LayoutView final : public events::GeometrySource {
   void CollectDamage(Element& element);
   std::optional<Rect> ClippedRect(const Element& element, const Rect& self);
   bool ScrollTo(Element& element, Point position, bool smooth);
-  // The box's scroll state; a clipping box laid out without one (never scrolled) gets it now.
-  static ScrollState* ScrollStateFor(const Element& element, Box& box);
   Element* ScrollerAt(Point viewPoint, bool* vertical);
 
   dom::Document& document_;

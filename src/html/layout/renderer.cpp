@@ -70,7 +70,7 @@ Size ContentExtent(const Element& element, const Box& box, const Edges& border, 
 // Whether the box keeps a scroll state through layout: the root, boxes with scroll bars, and
 // clipping boxes the program has scrolled. A clipping box at (0, 0), like every cell of a table
 // whose cells hide what overflows them, lays out as a plain box that clips; it gets its state
-// when it is first scrolled (LayoutView::ScrollStateFor).
+// when it is first scrolled (see the layout view).
 bool NeedsScrollState(const Element& element, const ComputedStyle& style, const Box& box) {
   if (element.parent() == nullptr) return true;
   if (!Clips(style)) return false;
