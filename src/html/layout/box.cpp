@@ -3,30 +3,18 @@
 #include <algorithm>
 #include <cmath>
 #include <cstddef>
-#include <memory_resource>
+
+#include "base/size_class_pool.h"
 
 namespace kestrune::html::layout {
 namespace {
 
-#if defined(__SANITIZE_ADDRESS__)
-#define KESTRUNE_BOX_POOL 0
-#elif defined(__has_feature)
-#if __has_feature(address_sanitizer)
-#define KESTRUNE_BOX_POOL 0
-#endif
-#endif
-#ifndef KESTRUNE_BOX_POOL
-#define KESTRUNE_BOX_POOL 1
-#endif
-
 // A big table has a box per element: they come from a pool like the nodes do, without a heap
-// header each. UI thread only; sanitizer builds use the heap, which checks lifetimes.
-#if KESTRUNE_BOX_POOL
-std::pmr::unsynchronized_pool_resource& BoxMemory() {
-  static auto* pool = new std::pmr::unsynchronized_pool_resource();
+// header each. UI thread only.
+SizeClassPool& BoxMemory() {
+  static auto* pool = new SizeClassPool();
   return *pool;
 }
-#endif
 
 constexpr int kMaxPx = 1 << 24;  // lengths stay far from int overflow when summed
 
@@ -43,22 +31,9 @@ bool Drawn(const css::Border& border) {
 
 }  // namespace
 
-void* Box::operator new(std::size_t size) {
-#if KESTRUNE_BOX_POOL
-  return BoxMemory().allocate(size, alignof(Box));
-#else
-  return ::operator new(size);
-#endif
-}
+void* Box::operator new(std::size_t size) { return BoxMemory().Allocate(size); }
 
-void Box::operator delete(void* memory, std::size_t size) {
-#if KESTRUNE_BOX_POOL
-  BoxMemory().deallocate(memory, size, alignof(Box));
-#else
-  (void)size;
-  ::operator delete(memory);
-#endif
-}
+void Box::operator delete(void* memory, std::size_t size) { BoxMemory().Deallocate(memory, size); }
 
 BoxExtras& Box::Extras() {
   if (!extras) extras = std::make_unique<BoxExtras>();
