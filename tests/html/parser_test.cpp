@@ -114,13 +114,18 @@ TEST(HtmlParser, ReadsEveryAttributeForm) {
   EXPECT_EQ(*input->Attr(dom::kAtomValue), u"it");
   EXPECT_EQ(*input->Attr(dom::kAtomId), u"x");  // the first of two wins
   EXPECT_EQ(*input->Attr(dom::InternName("data-a")), u"1");
+
+  nodes = Fragment(u"<a title=\"x &amp; y&lt;z & w&\" href=p&amp;q>t</a>");
+  EXPECT_EQ(*E(nodes[0])->Attr(dom::InternName("title")), u"x & y<z & w&");
+  EXPECT_EQ(*E(nodes[0])->Attr(dom::kAtomHref), u"p&q");
 }
 
 TEST(HtmlParser, PutsThePagesHtmlAttributesOnTheRoot) {
   dom::Document document;
-  ParseDocument(u"<html lang=en><head><title>T</title></head><body id=b>x</body></html>", document);
+  ParseDocument(u"<html lang=en><head><title>T</title></head><html lang=fr dir=rtl><body id=b>x</body></html>", document);
   Element* root = document.root();
-  EXPECT_EQ(*root->Attr(dom::InternName("lang")), u"en");
+  EXPECT_EQ(*root->Attr(dom::InternName("lang")), u"en");  // a second tag only adds what is missing
+  EXPECT_EQ(*root->Attr(dom::InternName("dir")), u"rtl");
   ASSERT_EQ(root->elementCount(), 2u);
   EXPECT_EQ(Tag(root->ElementAt(1)), u"body");
 }

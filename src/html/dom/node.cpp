@@ -2,40 +2,22 @@
 
 #include <algorithm>
 #include <cstddef>
-#include <memory_resource>
+#include <iterator>
 #include <new>
 
+#include "base/size_class_pool.h"
 #include "html/dom/document.h"
 
 namespace kestrune::html::dom {
 namespace {
 
-#if defined(__SANITIZE_ADDRESS__)
-#define KESTRUNE_NODE_POOL 0
-#elif defined(__has_feature)
-#if __has_feature(address_sanitizer)
-#define KESTRUNE_NODE_POOL 0
-#endif
-#endif
-#ifndef KESTRUNE_NODE_POOL
-#define KESTRUNE_NODE_POOL 1
-#endif
-
 // Nodes come and go by the hundred thousand when a big table is replaced: they are kept in a
 // pool of their own sizes. Like the rest of the engine it serves the UI thread only. It lives
-// until the process ends, so that nodes freed late (by statics) still have it. Sanitizer builds
-// use the ordinary heap, which checks every node's lifetime.
-#if KESTRUNE_NODE_POOL
-std::pmr::unsynchronized_pool_resource& NodeMemory() {
-  static auto* pool = new std::pmr::unsynchronized_pool_resource();
+// until the process ends, so that nodes freed late (by statics) still have it.
+SizeClassPool& NodeMemory() {
+  static auto* pool = new SizeClassPool();
   return *pool;
 }
-void* AllocateNode(std::size_t size) { return NodeMemory().allocate(size, alignof(std::max_align_t)); }
-void FreeNode(void* memory, std::size_t size) { NodeMemory().deallocate(memory, size, alignof(std::max_align_t)); }
-#else
-void* AllocateNode(std::size_t size) { return ::operator new(size); }
-void FreeNode(void* memory, std::size_t) { ::operator delete(memory); }
-#endif
 
 bool Contains(const std::vector<Atom>& atoms, Atom atom) {
   return std::find(atoms.begin(), atoms.end(), atom) != atoms.end();
@@ -43,17 +25,28 @@ bool Contains(const std::vector<Atom>& atoms, Atom atom) {
 
 }  // namespace
 
+void* AllocateNodeMemory(std::size_t size) { return NodeMemory().Allocate(size); }
+void FreeNodeMemory(void* memory, std::size_t size) noexcept { NodeMemory().Deallocate(memory, size); }
+
 void Node::Release() {
   if (--refs_ > 0) return;
-  std::vector<Node*> doomed{this};
-  while (!doomed.empty()) {
-    Node* node = doomed.back();
-    doomed.pop_back();
+  // Nodes to free are chained in the place of their parent pointer, which they no longer
+  // need: freeing a table of any size or depth takes no memory of its own.
+  nextDoomed_ = nullptr;
+  Node* doomed = this;
+  while (doomed) {
+    Node* node = doomed;
+    doomed = node->nextDoomed_;
+    node->parent_ = nullptr;
     if (node->isElement_) {
       auto* element = static_cast<Element*>(node);
       for (Node* child : element->children_) {
-        child->parent_ = nullptr;
-        if (--child->refs_ == 0) doomed.push_back(child);
+        if (--child->refs_ == 0) {
+          child->nextDoomed_ = doomed;
+          doomed = child;
+        } else {
+          child->parent_ = nullptr;
+        }
       }
       element->children_.clear();
       delete element;
@@ -63,12 +56,12 @@ void Node::Release() {
   }
 }
 
-void* Element::operator new(std::size_t size) { return AllocateNode(size); }
-void Element::operator delete(void* memory, std::size_t size) { FreeNode(memory, size); }
+void* Element::operator new(std::size_t size) { return AllocateNodeMemory(size); }
+void Element::operator delete(void* memory, std::size_t size) { FreeNodeMemory(memory, size); }
 
 Ref<Text> Text::Create(std::u16string_view text) {
   static_assert(sizeof(Text) % alignof(char16_t) == 0);
-  void* memory = AllocateNode(sizeof(Text) + text.size() * sizeof(char16_t));
+  void* memory = AllocateNodeMemory(sizeof(Text) + text.size() * sizeof(char16_t));
   Text* node = ::new (memory) Text(text.size());
   std::copy(text.begin(), text.end(), reinterpret_cast<char16_t*>(node + 1));
   return Ref<Text>(node);
@@ -77,7 +70,7 @@ Ref<Text> Text::Create(std::u16string_view text) {
 void Text::Destroy(Text* text) {
   const std::size_t size = sizeof(Text) + text->length_ * sizeof(char16_t);
   text->~Text();
-  FreeNode(text, size);
+  FreeNodeMemory(text, size);
 }
 
 Ref<Element> Element::Create(Atom tag) { return Ref<Element>(new Element(tag)); }
@@ -87,6 +80,17 @@ const std::u16string* Element::Attr(Atom name) const {
     if (attribute.name == name) return &attribute.value;
   }
   return nullptr;
+}
+
+void Element::TakeParsedAttributes(std::vector<Attribute>& attributes) {
+  if (attributes_.empty()) {
+    attributes_.assign(std::make_move_iterator(attributes.begin()), std::make_move_iterator(attributes.end()));
+  } else {
+    for (Attribute& attribute : attributes) {
+      if (!HasAttr(attribute.name)) attributes_.push_back(std::move(attribute));
+    }
+  }
+  attributes.clear();
 }
 
 void Element::SetAttr(Atom name, std::u16string value) {

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <memory>
 #include <string>
@@ -43,7 +44,10 @@ class Node {
 
  private:
   friend class Element;
-  Element* parent_ = nullptr;
+  union {
+    Element* parent_ = nullptr;
+    Node* nextDoomed_;  // once released: the next node Release frees
+  };
   std::uint32_t refs_ = 0;
   std::uint32_t nodeIndex_ = 0;
   bool isElement_;
@@ -102,6 +106,24 @@ class Text : public Node {
   std::size_t length_;
 };
 
+// Nodes and their lists of children and attributes come from a pool of their own (node.cpp).
+void* AllocateNodeMemory(std::size_t size);
+void FreeNodeMemory(void* memory, std::size_t size) noexcept;
+
+template <typename T>
+struct NodeAllocator {
+  using value_type = T;
+  NodeAllocator() = default;
+  template <typename U>
+  NodeAllocator(const NodeAllocator<U>&) {}
+  T* allocate(std::size_t count) { return static_cast<T*>(AllocateNodeMemory(count * sizeof(T))); }
+  void deallocate(T* memory, std::size_t count) noexcept { FreeNodeMemory(memory, count * sizeof(T)); }
+  friend bool operator==(const NodeAllocator&, const NodeAllocator&) { return true; }
+};
+
+template <typename T>
+using NodeVector = std::vector<T, NodeAllocator<T>>;
+
 struct Attribute {
   Atom name;
   std::u16string value;
@@ -148,21 +170,20 @@ class Element : public Node {
   Atom tag() const { return tag_; }
 
   // Attributes, in document order; names are atoms (lower case).
-  const std::vector<Attribute>& attributes() const { return attributes_; }
+  const NodeVector<Attribute>& attributes() const { return attributes_; }
   const std::u16string* Attr(Atom name) const;
   bool HasAttr(Atom name) const { return Attr(name) != nullptr; }
   void SetAttr(Atom name, std::u16string value);
   bool RemoveAttr(Atom name);
-  // Only for the parser: appends without looking for an earlier attribute of the name.
-  void AppendAttrUnchecked(Atom name, std::u16string value) {
-    attributes_.push_back({name, std::move(value)});
-  }
+  // Only for the parser: adds the attributes of a tag (names not repeated) whose names the
+  // element lacks, without change notices; the list is left empty with its room.
+  void TakeParsedAttributes(std::vector<Attribute>& attributes);
 
   std::uint32_t state() const { return state_; }
   void SetState(std::uint32_t state);
 
   // Children: all nodes, and the element children alone (the ones the engine interface counts).
-  const std::vector<Node*>& nodes() const { return children_; }
+  const NodeVector<Node*>& nodes() const { return children_; }
   std::size_t elementCount() const { return children_.size() - textChildren_; }
   Element* ElementAt(std::size_t index) const;
   // Index among the parent's element children; 0 without a parent.
@@ -215,8 +236,8 @@ class Element : public Node {
   std::uint32_t elementIndex_ = 0;
   std::uint16_t dirty_ = kStyleDirty | kLayoutDirty | kPaintDirty;
   Document* document_ = nullptr;  // set on a document's root only
-  std::vector<Attribute> attributes_;
-  std::vector<Node*> children_;
+  NodeVector<Attribute> attributes_;
+  NodeVector<Node*> children_;
   std::shared_ptr<const css::ComputedStyle> style_;
   std::unique_ptr<Extension> layout_;
   std::unique_ptr<RareData> rare_;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <array>
+#include <cstdint>
 #include <initializer_list>
 
 #include "base/text.h"
@@ -24,20 +25,39 @@ bool IsNameChar(char16_t c) {
   return !IsSpace(c) && c != u'>' && c != u'/' && c != u'=' && c != u'<' && c != u'"' && c != u'\'';
 }
 
-// Containers in which whitespace between children never shows: it is dropped while parsing.
-bool DropsWhitespace(Atom tag) {
-  return OneOf(tag, {dom::kAtomHtml, dom::kAtomHead, dom::kAtomTable, dom::kAtomThead, dom::kAtomTbody,
-                     dom::kAtomTfoot, dom::kAtomTr, dom::kAtomSelect, dom::kAtomUl, dom::kAtomOl,
-                     dom::kAtomMenu, dom::kAtomOptions, dom::kAtomOptgroup, dom::kAtomDl,
-                     dom::kAtomColgroup});
+// What the parser needs to know of a tag, looked up once per tag instead of in lists.
+enum TagTrait : std::uint8_t {
+  kVoid = 0x1,             // no content, no end tag
+  kRawText = 0x2,          // content is raw text, not markup
+  kDropsWhitespace = 0x4,  // whitespace between its children never shows: dropped while parsing
+  kStartsBlock = 0x8,      // closes an open `p`
+};
+
+using TraitTable = std::array<std::uint8_t, dom::kAtomKnownCount>;
+
+TraitTable MakeTraits() {
+  using namespace dom;
+  TraitTable traits{};
+  auto mark = [&](std::initializer_list<Atom> tags, TagTrait trait) {
+    for (Atom tag : tags) traits[tag] |= trait;
+  };
+  mark({kAtomArea, kAtomBase, kAtomBr, kAtomCol, kAtomEmbed, kAtomHr, kAtomImg, kAtomInput, kAtomLink, kAtomMeta,
+        kAtomParam, kAtomSource, kAtomTrack, kAtomWbr},
+       kVoid);
+  mark({kAtomScript, kAtomStyle, kAtomTextarea, kAtomTitle}, kRawText);
+  mark({kAtomHtml, kAtomHead, kAtomTable, kAtomThead, kAtomTbody, kAtomTfoot, kAtomTr, kAtomSelect, kAtomUl, kAtomOl,
+        kAtomMenu, kAtomOptions, kAtomOptgroup, kAtomDl, kAtomColgroup},
+       kDropsWhitespace);
+  mark({kAtomP, kAtomDiv, kAtomUl, kAtomOl, kAtomDl, kAtomTable, kAtomH1, kAtomH2, kAtomH3, kAtomH4, kAtomH5,
+        kAtomH6, kAtomPre, kAtomForm, kAtomBlockquote, kAtomSection, kAtomHeader, kAtomFooter, kAtomNav,
+        kAtomAddress, kAtomFieldset, kAtomHr, kAtomMenu, kAtomCenter},
+       kStartsBlock);
+  return traits;
 }
 
-bool StartsBlock(Atom tag) {
-  return OneOf(tag, {dom::kAtomP, dom::kAtomDiv, dom::kAtomUl, dom::kAtomOl, dom::kAtomDl, dom::kAtomTable,
-                     dom::kAtomH1, dom::kAtomH2, dom::kAtomH3, dom::kAtomH4, dom::kAtomH5, dom::kAtomH6,
-                     dom::kAtomPre, dom::kAtomForm, dom::kAtomBlockquote, dom::kAtomSection,
-                     dom::kAtomHeader, dom::kAtomFooter, dom::kAtomNav, dom::kAtomAddress,
-                     dom::kAtomFieldset, dom::kAtomHr, dom::kAtomMenu, dom::kAtomCenter});
+bool Has(Atom tag, TagTrait trait) {
+  static const TraitTable traits = MakeTraits();
+  return tag < traits.size() && (traits[tag] & trait) != 0;
 }
 
 class TreeBuilder {
@@ -123,7 +143,7 @@ class TreeBuilder {
   // look names up, so that stray ones never grow the table.
   Atom Name(std::u16string_view name, bool intern = true) {
     if (name.empty()) return dom::InternName(name);
-    auto& slot = names_[(name.size() * 31 + name[0]) % names_.size()];
+    auto& slot = names_[(name.size() * 31 + name.front() * 7 + name.back()) % names_.size()];
     if (slot.second != dom::kAtomNone && slot.first == name) return slot.second;
     const Atom atom = intern ? dom::InternName(name) : dom::FindName(name);
     if (atom != dom::kAtomNone) slot = {std::u16string(name), atom};
@@ -134,7 +154,7 @@ class TreeBuilder {
     if (text_.empty()) return;
     const bool blank = std::all_of(text_.begin(), text_.end(), IsSpace);
     // A copy, so that the buffer keeps its room for the next text.
-    if (!(blank && DropsWhitespace(current()->tag()))) Append(dom::Text::Create(text_));
+    if (!(blank && Has(current()->tag(), kDropsWhitespace))) Append(dom::Text::Create(text_));
     text_.clear();
   }
 
@@ -165,25 +185,37 @@ class TreeBuilder {
     const bool quoted = quote == u'"' || quote == u'\'';
     if (quoted) ++pos_;
     while (pos_ < in_.size()) {
-      const char16_t c = in_[pos_];
-      // An unquoted value ends at "/>" too: pages write <td width=10/>.
-      if (quoted ? c == quote : (IsSpace(c) || c == u'>' || (c == u'/' && pos_ + 1 < in_.size() && in_[pos_ + 1] == u'>'))) break;
-      if (c == u'&') {
-        const std::size_t used = DecodeCharacterReference(in_, pos_, value);
-        if (used > 0) {
-          pos_ += used;
-          continue;
-        }
-      }
-      value.push_back(c);
-      ++pos_;
+      // Characters up to the end of the value or the next reference go over in one piece.
+      std::size_t end = pos_;
+      while (end < in_.size() && in_[end] != u'&' && !EndsValue(end, quoted, quote)) ++end;
+      value.append(in_.substr(pos_, end - pos_));
+      pos_ = end;
+      if (pos_ >= in_.size() || in_[pos_] != u'&') break;
+      const std::size_t used = DecodeCharacterReference(in_, pos_, value);
+      if (used == 0) value.push_back(in_[pos_++]);
+      pos_ += used;
     }
     if (quoted && pos_ < in_.size()) ++pos_;
     return value;
   }
 
-  // Reads attributes up to '>' and answers whether the tag closed itself with "/>".
+  // An unquoted value ends at "/>" too: pages write <td width=10/>.
+  bool EndsValue(std::size_t at, bool quoted, char16_t quote) const {
+    const char16_t c = in_[at];
+    if (quoted) return c == quote;
+    return IsSpace(c) || c == u'>' || (c == u'/' && at + 1 < in_.size() && in_[at + 1] == u'>');
+  }
+
+  // Reads attributes up to '>' and answers whether the tag closed itself with "/>". The first
+  // of two attributes of one name counts.
   bool ReadAttributes(Element& element) {
+    const bool selfClosed = ReadAttributeList();
+    if (!attributes_.empty()) element.TakeParsedAttributes(attributes_);
+    return selfClosed;
+  }
+
+  bool ReadAttributeList() {
+    attributes_.clear();
     for (;;) {
       SkipSpace();
       if (pos_ >= in_.size()) return false;
@@ -213,7 +245,9 @@ class TreeBuilder {
         value = ReadAttributeValue();
       }
       const Atom atom = Name(name);
-      if (!element.HasAttr(atom)) element.AppendAttrUnchecked(atom, std::move(value));
+      const bool repeated = std::any_of(attributes_.begin(), attributes_.end(),
+                                        [atom](const dom::Attribute& attribute) { return attribute.name == atom; });
+      if (!repeated) attributes_.push_back({atom, std::move(value)});
     }
   }
 
@@ -245,7 +279,7 @@ class TreeBuilder {
     } else if (tag == kAtomDt || tag == kAtomDd) {
       CloseOpen({kAtomDt, kAtomDd}, {kAtomDl});
     }
-    if (StartsBlock(tag) && current()->tag() == kAtomP && stack_.size() > 1) PopTo(stack_.size() - 1);
+    if (Has(tag, kStartsBlock) && current()->tag() == kAtomP && stack_.size() > 1) PopTo(stack_.size() - 1);
   }
 
   void StartTag() {
@@ -324,21 +358,15 @@ class TreeBuilder {
   std::vector<Element*> stack_;
   std::vector<std::vector<dom::Ref<dom::Node>>> pending_;  // children of each open element so far
   std::vector<std::vector<dom::Ref<dom::Node>>> spare_;    // emptied lists, kept for their room
-  std::array<std::pair<std::u16string, Atom>, 16> names_{};
+  std::array<std::pair<std::u16string, Atom>, 32> names_{};
+  std::vector<dom::Attribute> attributes_;  // of the tag being read; kept for its room
 };
 
 }  // namespace
 
-bool IsVoidElement(dom::Atom tag) {
-  using namespace dom;
-  return OneOf(tag, {kAtomArea, kAtomBase, kAtomBr, kAtomCol, kAtomEmbed, kAtomHr, kAtomImg, kAtomInput,
-                     kAtomLink, kAtomMeta, kAtomParam, kAtomSource, kAtomTrack, kAtomWbr});
-}
+bool IsVoidElement(dom::Atom tag) { return Has(tag, kVoid); }
 
-bool IsRawTextElement(dom::Atom tag) {
-  using namespace dom;
-  return OneOf(tag, {kAtomScript, kAtomStyle, kAtomTextarea, kAtomTitle});
-}
+bool IsRawTextElement(dom::Atom tag) { return Has(tag, kRawText); }
 
 void ParseDocument(std::u16string_view html, dom::Document& document) {
   Ref<Element> root = Element::Create(dom::kAtomHtml);
