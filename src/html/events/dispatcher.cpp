@@ -54,10 +54,14 @@ void EventDispatcher::DetachAll(Element& element, bool onlyBehaviors) {
   dom::RareData* rare = element.rareIfAny();
   if (!rare || rare->handlers.empty()) return;
   std::vector<dom::AttachedHandler> gone;
-  auto keep = std::stable_partition(rare->handlers.begin(), rare->handlers.end(),
-                                    [&](const dom::AttachedHandler& h) { return onlyBehaviors && h.behavior.empty(); });
-  gone.assign(keep, rare->handlers.end());
-  rare->handlers.erase(keep, rare->handlers.end());
+  if (onlyBehaviors) {
+    auto keep = std::stable_partition(rare->handlers.begin(), rare->handlers.end(),
+                                      [](const dom::AttachedHandler& h) { return h.behavior.empty(); });
+    gone.assign(keep, rare->handlers.end());
+    rare->handlers.erase(keep, rare->handlers.end());
+  } else {
+    gone.swap(rare->handlers);
+  }
   dom::Ref<Element> hold(&element);
   Depth depth(*this);
   for (const dom::AttachedHandler& handler : gone) {

@@ -239,23 +239,25 @@ bool Window::SetElementHtml(Element& element, std::u16string_view html, unsigned
   Element* parent = element.parent();
   if (where >= 3 && parent == nullptr) return false;
   if (where > 5) return false;
-  auto nodes = parse::ParseFragment(html, where >= 3 ? parent->tag() : element.tag());
   Ref<Element> hold(&element);
+  // Content that is replaced goes first: its memory is then warm for the new nodes, and the new
+  // nodes are still in the cache when they are inserted and styled.
+  if (where == 0) {
+    for (Ref<dom::Node>& old : element.RemoveAllChildren()) {
+      if (Element* gone = dom::AsElement(old.get())) ElementsLeaving(*gone);
+    }
+  }
+  auto nodes = parse::ParseFragment(html, where >= 3 ? parent->tag() : element.tag());
   if (MayHoldImages(html)) {
     for (auto& node : nodes) {
       if (Element* added = dom::AsElement(node.get())) RequestImages(*added);
     }
   }
   switch (where) {
-    case 0:
-      for (Ref<dom::Node>& old : element.RemoveAllChildren()) {
-        if (Element* gone = dom::AsElement(old.get())) ElementsLeaving(*gone);
-      }
-      element.AppendChildren(nodes);
-      break;
     case 1:
       for (std::size_t i = 0; i < nodes.size(); ++i) element.InsertNodeAt(i, nodes[i]);
       break;
+    case 0:
     case 2:
       element.AppendChildren(nodes);
       break;
