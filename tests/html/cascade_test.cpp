@@ -152,6 +152,17 @@ TEST_F(CascadeTest, RestylesOnlyWhatAChangeCanAffect) {
   EXPECT_EQ(styles_.lastComputed(), 0u);
 }
 
+TEST_F(CascadeTest, AlikeCousinsUnderDifferentlyStyledParentsInheritFromTheirOwn) {
+  Load(u"<div id=x style='color: red'><span id=s1>a</span></div><div id=y style='color: lime'><span id=s2>b</span></div>"
+       u"<div id=z><span id=s3>c</span></div><div id=w><span id=s4>d</span></div>",
+       u"span { font-weight: bold }");
+  EXPECT_EQ(Style(u"s1").color, 0xFFFF0000u);
+  EXPECT_EQ(Style(u"s2").color, 0xFF00FF00u);
+  EXPECT_EQ(Style(u"s3").color, 0xFF000000u);
+  EXPECT_EQ(ById(u"s3")->style(), ById(u"s4")->style());
+  EXPECT_NE(ById(u"s1")->style(), ById(u"s2")->style());
+}
+
 TEST_F(CascadeTest, SharesOneStyleAmongAlikeElementsAndReportsBehaviorAndVisibilityChanges) {
   std::u16string rows;
   for (int i = 0; i < 200; ++i) rows += u"<tr><td>1</td><td>2</td></tr>";

@@ -163,16 +163,16 @@ void StyleEngine::CollectMatches(const dom::Element& element) {
 std::uint32_t StyleEngine::ChainOf(const dom::Element& element, std::uint32_t parentChain) {
   const dom::StyleFeatures& features = document_.features();
   signature_.clear();
+  signature_.push_back(parentChain);
   signature_.push_back(element.tag());
   signature_.push_back(element.state() & features.states);
   std::uint64_t bits = 0;
-  const dom::Element* parent = element.parent();
-  for (std::size_t i = 0; i < structural_.size(); ++i) {
-    if (parent && MatchesPseudo(structural_[i].pseudo, element)) bits |= std::uint64_t{1} << i;
+  if (element.parent()) {
+    for (std::size_t i = 0; i < structural_.size(); ++i) {
+      if (MatchesPseudo(structural_[i].pseudo, element)) bits |= std::uint64_t{1} << i;
+    }
   }
-  // Both halves: a pointer-sized word may hold only 32 of the bits.
-  signature_.push_back(static_cast<std::uintptr_t>(bits & 0xFFFFFFFFu));
-  signature_.push_back(static_cast<std::uintptr_t>(bits >> 32));
+  signature_.push_back(bits);
   for (dom::Atom atom : features.attributes) {
     const std::u16string* value = element.Attr(atom);
     if (value == nullptr) {
@@ -182,10 +182,7 @@ std::uint32_t StyleEngine::ChainOf(const dom::Element& element, std::uint32_t pa
     auto [it, added] = values_.try_emplace(*value, static_cast<std::uint32_t>(values_.size() + 1));
     signature_.push_back(it->second);
   }
-  auto [sig, newSignature] = signatureIds_.try_emplace(signature_, static_cast<std::uint32_t>(signatureIds_.size() + 1));
-  const std::uint64_t link = (std::uint64_t{parentChain} << 32) | sig->second;
-  auto [chain, newChain] = chains_.try_emplace(link, static_cast<std::uint32_t>(chains_.size() + 1));
-  return chain->second;
+  return chains_.IdOf(signature_.data());
 }
 
 std::shared_ptr<const ComputedStyle> StyleEngine::Compute(dom::Element& element,
@@ -195,8 +192,12 @@ std::shared_ptr<const ComputedStyle> StyleEngine::Compute(dom::Element& element,
   const bool personal = element.HasAttr(dom::kAtomStyle) || (rare && !rare->runtimeStyle.empty());
   const std::pair<std::uintptr_t, std::uint32_t> chainKey{reinterpret_cast<std::uintptr_t>(parent.get()), chain};
   if (!personal && chain != 0) {
-    auto found = byChain_.find(chainKey);
-    if (found != byChain_.end()) {
+    if (chain < byChain_.size() && byChain_[chain].style && byChain_[chain].parent == parent.get()) {
+      ++lastShared_;
+      return byChain_[chain].style;
+    }
+    auto found = byChainElsewhere_.find(chainKey);
+    if (found != byChainElsewhere_.end()) {
       ++lastShared_;
       return found->second;
     }
@@ -241,8 +242,16 @@ std::shared_ptr<const ComputedStyle> StyleEngine::Compute(dom::Element& element,
     if (border.currentColor) border.color = style->color;
   }
   std::shared_ptr<const ComputedStyle> result = std::move(style);
-  if (!personal && chain != 0) byChain_.emplace(chainKey, result);
-  else if (!personal) shared_.emplace(key_, result);
+  if (!personal && chain != 0) {
+    if (chain >= byChain_.size()) byChain_.resize(std::max<std::size_t>(chain + 1, byChain_.size() * 2));
+    if (!byChain_[chain].style) {
+      byChain_[chain] = {parent.get(), result};
+    } else {
+      byChainElsewhere_.emplace(chainKey, result);
+    }
+  } else if (!personal) {
+    shared_.emplace(key_, result);
+  }
   return result;
 }
 
@@ -288,11 +297,11 @@ void StyleEngine::Update(StyleChanges* changes) {
   dom::Element* root = document_.root();
   if (!root || !(root->dirty() & (dom::kStyleDirty | dom::kSubtreeStyleDirty | dom::kChildStyleDirty))) return;
   static const std::shared_ptr<const ComputedStyle> kInitial = std::make_shared<const ComputedStyle>();
+  chains_.Reset(4 + document_.features().attributes.size());
   Visit(*root, kInitial, 0, false, changes, false);
   shared_.clear();
   byChain_.clear();
-  chains_.clear();
-  signatureIds_.clear();
+  byChainElsewhere_.clear();
   values_.clear();
 }
 

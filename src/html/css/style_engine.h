@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "html/css/computed_style.h"
+#include "html/css/key_table.h"
 #include "html/css/stylesheet.h"
 #include "html/dom/document.h"
 
@@ -94,11 +95,17 @@ class StyleEngine {
   // combinators exist, since then siblings would count too.
   bool signatures_ = true;
   std::vector<StructuralTest> structural_;
-  std::unordered_map<std::vector<std::uintptr_t>, std::uint32_t, KeyHash> signatureIds_;
-  std::unordered_map<std::uint64_t, std::uint32_t> chains_;
+  KeyTable chains_;  // ids of (parent's chain, signature)
+  std::vector<std::uint64_t> signature_;
   std::unordered_map<std::u16string, std::uint32_t> values_;
-  std::unordered_map<std::pair<std::uintptr_t, std::uint32_t>, std::shared_ptr<const ComputedStyle>, PairHash> byChain_;
-  std::vector<std::uintptr_t> signature_;
+  // The style computed for a chain, with the parent style it was computed under; a chain met
+  // under another parent style (an ancestor with a style attribute) keeps its style apart.
+  struct ChainStyle {
+    const ComputedStyle* parent = nullptr;
+    std::shared_ptr<const ComputedStyle> style;
+  };
+  std::vector<ChainStyle> byChain_;
+  std::unordered_map<std::pair<std::uintptr_t, std::uint32_t>, std::shared_ptr<const ComputedStyle>, PairHash> byChainElsewhere_;
   std::uint32_t nextOrder_ = 0;
   std::size_t lastComputed_ = 0;
   std::size_t lastShared_ = 0;
