@@ -27,6 +27,15 @@ TEST(DecodeUtf8, ReturnsWhatEncodeUtf8Wrote) {
   const std::u16string texts[] = {u"plain", u"Caf\u00E9 \u2602 \U0001F3B5", std::u16string{0xD800},
                                   std::u16string{0xDC00, 0xD800, u'z'}, std::u16string{}};
   for (const std::u16string& text : texts) EXPECT_EQ(DecodeUtf8(EncodeUtf8(text)), text);
+
+  // Runs of ASCII of every length up to beyond the widening buffer, between other characters.
+  std::u16string mixed;
+  for (std::size_t run = 0; run < 600; run += run < 20 ? 1 : 37) {
+    for (std::size_t k = 0; k < run; ++k) mixed.push_back(static_cast<char16_t>(u'a' + (k + run) % 26));
+    mixed += run % 2 ? u"\u00E9" : u"\U0001F3B5";
+  }
+  EXPECT_EQ(DecodeUtf8(EncodeUtf8(mixed)), mixed);
+  EXPECT_EQ(DecodeUtf8("abcdefgh\xFFijklmnopqrstu"), u"abcdefgh\uFFFDijklmnopqrstu");
 }
 
 TEST(DecodeUtf8, ReplacesEachMalformedByte) {
