@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <bit>
+#include <memory>
 #include <new>
 
 #if defined(__SANITIZE_ADDRESS__)
@@ -19,25 +20,25 @@ namespace kestrune {
 
 const bool SizeClassPool::kPoolsByDefault = KESTRUNE_POOLED != 0;
 
-// A block starts with this header and its free-slot bits; the slots follow. Blocks are aligned
-// to their size, so a slot's block is found from the slot's address alone.
+// A block's slots lie in a region of the block's size, aligned to it, whose first granule points
+// back to the block: a slot's block is found from the slot's address alone. The block's own
+// fields and free-slot bits live apart on the heap, since the regions' starts all fall on the
+// same cache sets and would evict one another.
 struct SizeClassPool::Block {
   static constexpr std::size_t kMaxSlots = kBlockSize / kGranule;
   static constexpr std::size_t kWords = kMaxSlots / 64;
 
-  std::size_t index;      // among its class's blocks
-  std::size_t slotSize;
-  std::size_t slotCount;
+  char* slots;
+  std::size_t index;         // among its class's blocks
+  std::uint32_t slotSize;
+  std::uint32_t reciprocal;  // 2^32 / slotSize, rounded up: offset / slotSize without a division
   std::size_t freeCount;
-  std::size_t firstWord;  // no word before this one has a free bit
+  std::size_t firstWord;     // no word before this one has a free bit
   std::uint64_t freeBits[kWords];
 
-  static constexpr std::size_t kHeader = sizeof(std::size_t) * 5 + sizeof(std::uint64_t) * kWords;
-  static constexpr std::size_t kSlotsOffset = (kHeader + kGranule - 1) / kGranule * kGranule;
-
-  static_assert(kSlotsOffset < kBlockSize / 4);
-
-  char* slots() { return reinterpret_cast<char*>(this) + kSlotsOffset; }
+  static Block* Of(void* memory) {
+    return *reinterpret_cast<Block**>(reinterpret_cast<std::uintptr_t>(memory) & ~std::uintptr_t{kBlockSize - 1});
+  }
 
   void* Take() {
     std::size_t word = firstWord;
@@ -46,11 +47,13 @@ struct SizeClassPool::Block {
     freeBits[word] &= freeBits[word] - 1;
     firstWord = word;
     --freeCount;
-    return slots() + (word * 64 + static_cast<std::size_t>(bit)) * slotSize;
+    return slots + (word * 64 + static_cast<std::size_t>(bit)) * slotSize;
   }
 
   void Give(void* memory) {
-    const std::size_t slot = static_cast<std::size_t>(static_cast<char*>(memory) - slots()) / slotSize;
+    // Offsets stay below 2^18 and sizes below 2^11, so the product rounds to the exact quotient.
+    const auto offset = static_cast<std::uint64_t>(static_cast<char*>(memory) - slots);
+    const std::size_t slot = static_cast<std::size_t>((offset * reciprocal) >> 32);
     const std::size_t word = slot / 64;
     freeBits[word] |= std::uint64_t{1} << (slot % 64);
     if (word < firstWord) firstWord = word;
@@ -60,7 +63,10 @@ struct SizeClassPool::Block {
 
 SizeClassPool::~SizeClassPool() {
   for (SizeClass& sizeClass : classes_) {
-    for (Block* block : sizeClass.blocks) ::operator delete(block, std::align_val_t{kBlockSize});
+    for (Block* block : sizeClass.blocks) {
+      ::operator delete(block->slots - kGranule, std::align_val_t{kBlockSize});
+      delete block;
+    }
   }
 }
 
@@ -73,19 +79,23 @@ std::size_t SizeClassPool::reserved() const {
 SizeClassPool::Block* SizeClassPool::NewBlock(std::size_t sizeClass) {
   SizeClass& owner = classes_[sizeClass];
   owner.blocks.reserve(owner.blocks.size() + 1);
-  auto* block = static_cast<Block*>(::operator new(kBlockSize, std::align_val_t{kBlockSize}));
+  auto block = std::make_unique<Block>();
+  auto* region = static_cast<char*>(::operator new(kBlockSize, std::align_val_t{kBlockSize}));
+  *reinterpret_cast<Block**>(region) = block.get();
+  block->slots = region + kGranule;
   block->index = owner.blocks.size();
-  block->slotSize = (sizeClass + 1) * kGranule;
-  block->slotCount = (kBlockSize - Block::kSlotsOffset) / block->slotSize;
-  block->freeCount = block->slotCount;
+  block->slotSize = static_cast<std::uint32_t>((sizeClass + 1) * kGranule);
+  block->reciprocal = static_cast<std::uint32_t>(((std::uint64_t{1} << 32) + block->slotSize - 1) / block->slotSize);
+  const std::size_t slotCount = (kBlockSize - kGranule) / block->slotSize;
+  block->freeCount = slotCount;
   block->firstWord = 0;
   for (std::size_t word = 0; word < Block::kWords; ++word) {
     const std::size_t first = word * 64;
-    const std::size_t inWord = first >= block->slotCount ? 0 : std::min<std::size_t>(64, block->slotCount - first);
+    const std::size_t inWord = first >= slotCount ? 0 : std::min<std::size_t>(64, slotCount - first);
     block->freeBits[word] = inWord == 64 ? ~std::uint64_t{0} : (std::uint64_t{1} << inWord) - 1;
   }
-  owner.blocks.push_back(block);
-  return block;
+  owner.blocks.push_back(block.get());
+  return block.release();
 }
 
 void* SizeClassPool::Allocate(std::size_t size) {
@@ -103,7 +113,7 @@ void SizeClassPool::Deallocate(void* memory, std::size_t size) noexcept {
     ::operator delete(memory);
     return;
   }
-  auto* block = reinterpret_cast<Block*>(reinterpret_cast<std::uintptr_t>(memory) & ~std::uintptr_t{kBlockSize - 1});
+  Block* block = Block::Of(memory);
   block->Give(memory);
   SizeClass& owner = classes_[ClassOf(size)];
   if (block->index < owner.firstFree) owner.firstFree = block->index;
