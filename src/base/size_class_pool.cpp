@@ -20,10 +20,13 @@ namespace kestrune {
 
 const bool SizeClassPool::kPoolsByDefault = KESTRUNE_POOLED != 0;
 
-// A block's slots lie in a region of the block's size, aligned to it, whose first granule points
-// back to the block: a slot's block is found from the slot's address alone. The block's own
+// A block's slots lie in a region of the block's size, aligned to it, whose first cache line
+// points back to the block (the slots start at the next line, so that objects of a multiple of
+// the line's size never straddle more lines than they must): a slot's block is found from the slot's address alone. The block's own
 // fields and free-slot bits live apart on the heap, since the regions' starts all fall on the
 // same cache sets and would evict one another.
+constexpr std::size_t kCacheLine = 64;
+
 struct SizeClassPool::Block {
   static constexpr std::size_t kMaxSlots = kBlockSize / kGranule;
   static constexpr std::size_t kWords = kMaxSlots / 64;
@@ -64,7 +67,7 @@ struct SizeClassPool::Block {
 SizeClassPool::~SizeClassPool() {
   for (SizeClass& sizeClass : classes_) {
     for (Block* block : sizeClass.blocks) {
-      ::operator delete(block->slots - kGranule, std::align_val_t{kBlockSize});
+      ::operator delete(block->slots - kCacheLine, std::align_val_t{kBlockSize});
       delete block;
     }
   }
@@ -82,11 +85,11 @@ SizeClassPool::Block* SizeClassPool::NewBlock(std::size_t sizeClass) {
   auto block = std::make_unique<Block>();
   auto* region = static_cast<char*>(::operator new(kBlockSize, std::align_val_t{kBlockSize}));
   *reinterpret_cast<Block**>(region) = block.get();
-  block->slots = region + kGranule;
+  block->slots = region + kCacheLine;
   block->index = owner.blocks.size();
   block->slotSize = static_cast<std::uint32_t>((sizeClass + 1) * kGranule);
   block->reciprocal = static_cast<std::uint32_t>(((std::uint64_t{1} << 32) + block->slotSize - 1) / block->slotSize);
-  const std::size_t slotCount = (kBlockSize - kGranule) / block->slotSize;
+  const std::size_t slotCount = (kBlockSize - kCacheLine) / block->slotSize;
   block->freeCount = slotCount;
   block->firstWord = 0;
   for (std::size_t word = 0; word < Block::kWords; ++word) {

@@ -230,17 +230,18 @@ class Element : public Node {
   void ChildrenChanged();
   void AttributeChanged(Atom name);
 
+  // What walks of the tree read comes first, in the first cache line with the node's own fields.
   Atom tag_;
   std::uint32_t state_ = 0;
   std::uint32_t textChildren_ = 0;
   std::uint32_t elementIndex_ = 0;
   std::uint16_t dirty_ = kStyleDirty | kLayoutDirty | kPaintDirty;
-  Document* document_ = nullptr;  // set on a document's root only
-  NodeVector<Attribute> attributes_;
   NodeVector<Node*> children_;
+  NodeVector<Attribute> attributes_;
   std::shared_ptr<const css::ComputedStyle> style_;
-  std::unique_ptr<Extension> layout_;
   std::unique_ptr<RareData> rare_;
+  std::unique_ptr<Extension> layout_;
+  Document* document_ = nullptr;  // set on a document's root only
 };
 
 inline Element* AsElement(Node* node) { return node && node->IsElement() ? static_cast<Element*>(node) : nullptr; }
