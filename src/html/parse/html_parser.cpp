@@ -121,7 +121,7 @@ class TreeBuilder {
 
   void PopTo(std::size_t depth) {
     while (stack_.size() > depth) {
-      stack_.back()->AppendChildren(pending_.back());
+      stack_.back()->AppendParsedChildren(pending_.back());
       if (stack_.size() == 1) return;  // the container stays, with its children given
       stack_.pop_back();
       spare_.push_back(std::move(pending_.back()));
@@ -152,9 +152,9 @@ class TreeBuilder {
 
   void FlushText() {
     if (text_.empty()) return;
-    const bool blank = std::all_of(text_.begin(), text_.end(), IsSpace);
+    const bool dropped = Has(current()->tag(), kDropsWhitespace) && std::all_of(text_.begin(), text_.end(), IsSpace);
     // A copy, so that the buffer keeps its room for the next text.
-    if (!(blank && Has(current()->tag(), kDropsWhitespace))) Append(dom::Text::Create(text_));
+    if (!dropped) Append(dom::Text::Create(text_));
     text_.clear();
   }
 
