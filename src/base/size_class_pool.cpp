@@ -5,6 +5,10 @@
 #include <memory>
 #include <new>
 
+#if defined(__linux__)
+#include <sys/mman.h>
+#endif
+
 #if defined(__SANITIZE_ADDRESS__)
 #define KESTRUNE_POOLED 0
 #elif defined(__has_feature)
@@ -66,11 +70,23 @@ struct SizeClassPool::Block {
 
 SizeClassPool::~SizeClassPool() {
   for (SizeClass& sizeClass : classes_) {
-    for (Block* block : sizeClass.blocks) {
-      ::operator delete(block->slots - kCacheLine, std::align_val_t{kBlockSize});
-      delete block;
-    }
+    for (Block* block : sizeClass.blocks) delete block;
   }
+  for (void* chunk : chunks_) ::operator delete(chunk, std::align_val_t{kChunkSize});
+}
+
+char* SizeClassPool::NewRegion() {
+  if (regionsLeft_ == 0) {
+    chunks_.reserve(chunks_.size() + 1);
+    void* chunk = ::operator new(kChunkSize, std::align_val_t{kChunkSize});
+#if defined(__linux__)
+    madvise(chunk, kChunkSize, MADV_HUGEPAGE);  // only advice: without it, ordinary pages
+#endif
+    chunks_.push_back(chunk);
+    regionsLeft_ = kChunkSize / kBlockSize;
+  }
+  --regionsLeft_;
+  return static_cast<char*>(chunks_.back()) + (kChunkSize / kBlockSize - 1 - regionsLeft_) * kBlockSize;
 }
 
 std::size_t SizeClassPool::reserved() const {
@@ -83,7 +99,7 @@ SizeClassPool::Block* SizeClassPool::NewBlock(std::size_t sizeClass) {
   SizeClass& owner = classes_[sizeClass];
   owner.blocks.reserve(owner.blocks.size() + 1);
   auto block = std::make_unique<Block>();
-  auto* region = static_cast<char*>(::operator new(kBlockSize, std::align_val_t{kBlockSize}));
+  char* region = NewRegion();
   *reinterpret_cast<Block**>(region) = block.get();
   block->slots = region + kCacheLine;
   block->index = owner.blocks.size();

@@ -34,6 +34,9 @@ class SizeClassPool {
   static constexpr std::size_t kGranule = 16;
   static constexpr std::size_t kLargest = 1024;  // bigger objects go to the heap one by one
   static constexpr std::size_t kBlockSize = std::size_t{256} << 10;
+  // Regions are cut from chunks of a huge page's size, which Linux is asked to back with huge
+  // pages: a tree of a hundred thousand nodes then needs few address translations.
+  static constexpr std::size_t kChunkSize = std::size_t{2} << 20;
 
  private:
   struct Block;
@@ -45,9 +48,12 @@ class SizeClassPool {
 
   static std::size_t ClassOf(std::size_t size) { return size == 0 ? 0 : (size - 1) / kGranule; }
   Block* NewBlock(std::size_t sizeClass);
+  char* NewRegion();
 
   bool pooled_;
   std::array<SizeClass, kClasses> classes_;
+  std::vector<void*> chunks_;  // regions are cut from these, a few at a time
+  std::size_t regionsLeft_ = 0;
 };
 
 }  // namespace kestrune
