@@ -242,11 +242,7 @@ bool Window::SetElementHtml(Element& element, std::u16string_view html, unsigned
   Ref<Element> hold(&element);
   // Content that is replaced goes first: its memory is then warm for the new nodes, and the new
   // nodes are still in the cache when they are inserted and styled.
-  if (where == 0) {
-    for (Ref<dom::Node>& old : element.RemoveAllChildren()) {
-      if (Element* gone = dom::AsElement(old.get())) ElementsLeaving(*gone);
-    }
-  }
+  if (where == 0) ReleaseChildren(element);
   auto nodes = parse::ParseFragment(html, where >= 3 ? parent->tag() : element.tag());
   if (MayHoldImages(html)) {
     for (auto& node : nodes) {
@@ -281,10 +277,15 @@ void Window::Detach(Element& element) {
   Update();
 }
 
-void Window::SetInnerText(Element& element, std::u16string_view text) {
+void Window::ReleaseChildren(Element& element) {
   for (Ref<dom::Node>& old : element.RemoveAllChildren()) {
     if (Element* gone = dom::AsElement(old.get())) ElementsLeaving(*gone);
+    old = {};  // freed at once, while its nodes are still in the cache
   }
+}
+
+void Window::SetInnerText(Element& element, std::u16string_view text) {
+  ReleaseChildren(element);
   if (!text.empty()) element.AppendChild(dom::Text::Create(std::u16string(text)));
   Update();
 }

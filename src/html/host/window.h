@@ -106,6 +106,8 @@ class Window final : public controls::ControlHost, private layout::ImageSource {
   void RequestImages(dom::Element& subtree);
   void AttachBehaviors(dom::Element& element);
   void ElementsLeaving(dom::Element& subtree);
+  // Takes every child out of the element and lets it go.
+  void ReleaseChildren(dom::Element& element);
   void DeliverData(dom::Ref<dom::Element> initiator, dom::Ref<dom::Element> into, std::u16string url,
                    unsigned dataType, platform::HttpResponse response);
 
