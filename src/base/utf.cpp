@@ -83,7 +83,13 @@ std::u16string DecodeUtf8(std::string_view bytes) {
       char16_t wide[256];
       while (i < end) {
         const std::size_t count = std::min(end - i, std::size(wide));
-        for (std::size_t k = 0; k < count; ++k) wide[k] = static_cast<unsigned char>(bytes[i + k]);
+        std::size_t k = 0;
+        for (; std::endian::native == std::endian::little && k + 8 <= count; k += 8) {
+          std::uint64_t word;
+          std::memcpy(&word, bytes.data() + i + k, sizeof word);
+          for (std::size_t b = 0; b < 8; ++b) wide[k + b] = static_cast<char16_t>((word >> (8 * b)) & 0xFF);
+        }
+        for (; k < count; ++k) wide[k] = static_cast<unsigned char>(bytes[i + k]);
         out.append(wide, count);
         i += count;
       }

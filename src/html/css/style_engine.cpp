@@ -173,14 +173,19 @@ std::uint32_t StyleEngine::ChainOf(const dom::Element& element, std::uint32_t pa
     }
   }
   signature_.push_back(bits);
-  for (dom::Atom atom : features.attributes) {
-    const std::u16string* value = element.Attr(atom);
+  lastValues_.resize(features.attributes.size());
+  for (std::size_t i = 0; i < features.attributes.size(); ++i) {
+    const std::u16string* value = element.attributes().empty() ? nullptr : element.Attr(features.attributes[i]);
     if (value == nullptr) {
       signature_.push_back(0);
       continue;
     }
-    auto [it, added] = values_.try_emplace(*value, static_cast<std::uint32_t>(values_.size() + 1));
-    signature_.push_back(it->second);
+    auto& [lastValue, lastId] = lastValues_[i];
+    if (lastId == 0 || lastValue != *value) {
+      lastValue = *value;
+      lastId = values_.try_emplace(*value, static_cast<std::uint32_t>(values_.size() + 1)).first->second;
+    }
+    signature_.push_back(lastId);
   }
   return chains_.IdOf(signature_.data());
 }
@@ -303,6 +308,7 @@ void StyleEngine::Update(StyleChanges* changes) {
   byChain_.clear();
   byChainElsewhere_.clear();
   values_.clear();
+  lastValues_.clear();
 }
 
 }  // namespace kestrune::html::css

@@ -98,6 +98,9 @@ class StyleEngine {
   KeyTable chains_;  // ids of (parent's chain, signature)
   std::vector<std::uint64_t> signature_;
   std::unordered_map<std::u16string, std::uint32_t> values_;
+  // The last value met of each attribute in features().attributes, with its id: rows of a table
+  // repeat them.
+  std::vector<std::pair<std::u16string, std::uint32_t>> lastValues_;
   // The style computed for a chain, with the parent style it was computed under; a chain met
   // under another parent style (an ancestor with a style attribute) keeps its style apart.
   struct ChainStyle {

@@ -159,7 +159,9 @@ std::intptr_t Window::Notify(NotificationHeader& header) {
 void Window::AttachBehaviors(Element& element) {
   // An element that left the document while behaviors were being attached lost its style there.
   if (!element.style()) return;
-  const std::vector<std::string> names = element.style() ? css::BehaviorNames(*element.style()) : std::vector<std::string>{};
+  // Held, so that the names stay while handlers run (and may restyle the element).
+  const std::shared_ptr<const css::ComputedStyle> style = element.style();
+  const std::vector<std::string>& names = css::BehaviorNames(*style);
   if (dom::RareData* rare = element.rareIfAny()) {
     std::vector<dom::AttachedHandler> gone;
     for (const dom::AttachedHandler& handler : rare->handlers) {
