@@ -145,6 +145,9 @@ struct AttachedHandler {
 
 // Data few elements have, kept out of line so that a big table stays small.
 struct RareData {
+  static void* operator new(std::size_t size) { return AllocateNodeMemory(size); }
+  static void operator delete(void* memory, std::size_t size) { FreeNodeMemory(memory, size); }
+
   std::vector<std::pair<std::u16string, std::u16string>> runtimeStyle;  // set by the program
   std::vector<AttachedHandler> handlers;
   std::unique_ptr<Extension> parsedInlineStyle;

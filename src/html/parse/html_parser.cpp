@@ -35,11 +35,11 @@ enum TagTrait : std::uint8_t {
 
 using TraitTable = std::array<std::uint8_t, dom::kAtomKnownCount>;
 
-TraitTable MakeTraits() {
+constexpr TraitTable MakeTraits() {
   using namespace dom;
   TraitTable traits{};
   auto mark = [&](std::initializer_list<Atom> tags, TagTrait trait) {
-    for (Atom tag : tags) traits[tag] |= trait;
+    for (Atom tag : tags) traits[tag] = static_cast<std::uint8_t>(traits[tag] | trait);
   };
   mark({kAtomArea, kAtomBase, kAtomBr, kAtomCol, kAtomEmbed, kAtomHr, kAtomImg, kAtomInput, kAtomLink, kAtomMeta,
         kAtomParam, kAtomSource, kAtomTrack, kAtomWbr},
@@ -55,9 +55,17 @@ TraitTable MakeTraits() {
   return traits;
 }
 
-bool Has(Atom tag, TagTrait trait) {
-  static const TraitTable traits = MakeTraits();
-  return tag < traits.size() && (traits[tag] & trait) != 0;
+constexpr TraitTable kTraits = MakeTraits();
+
+bool Has(Atom tag, TagTrait trait) { return tag < kTraits.size() && (kTraits[tag] & trait) != 0; }
+
+// Names are short: a loop beats a call to memcmp.
+bool SameName(std::u16string_view a, std::u16string_view b) {
+  if (a.size() != b.size()) return false;
+  for (std::size_t i = 0; i < a.size(); ++i) {
+    if (a[i] != b[i]) return false;
+  }
+  return true;
 }
 
 class TreeBuilder {
@@ -144,7 +152,7 @@ class TreeBuilder {
   Atom Name(std::u16string_view name, bool intern = true) {
     if (name.empty()) return dom::InternName(name);
     auto& slot = names_[(name.size() * 31 + name.front() * 7 + name.back()) % names_.size()];
-    if (slot.second != dom::kAtomNone && slot.first == name) return slot.second;
+    if (slot.second != dom::kAtomNone && SameName(slot.first, name)) return slot.second;
     const Atom atom = intern ? dom::InternName(name) : dom::FindName(name);
     if (atom != dom::kAtomNone) slot = {std::u16string(name), atom};
     return atom;
