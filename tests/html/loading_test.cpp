@@ -67,6 +67,20 @@ TEST_F(LoadingTest, AsksForEverySheetAndImageByTheUrlThePageWrites) {
   EXPECT_EQ(server_.completes, 1);
 }
 
+TEST_F(LoadingTest, AsksForTheImagesOfHtmlSetIntoAnElementOnce) {
+  server_.files[u"a.png"] = "PNG";
+  Load("<body><div id=d></div></body>");
+  server_.requested.clear();
+  auto set = [&](const std::string& html, unsigned where) {
+    HTMLayoutSetElementHtml(Find("#d"), reinterpret_cast<const unsigned char*>(html.data()), html.size(), where);
+  };
+  set("<span><IMG src=a.png></span><p>no image here: &lt;img</p><img src=b.png><img>", kReplaceContent);
+  EXPECT_EQ(server_.requested, (std::vector<std::u16string>{u"a.png", u"b.png"}));
+  ASSERT_NE(window_->Resource(u"a.png"), nullptr);
+  set("<img src=a.png><b><img src=c.png></b>", kAppendAfterLast);  // a.png is held already
+  EXPECT_EQ(server_.requested, (std::vector<std::u16string>{u"a.png", u"b.png", u"c.png"}));
+}
+
 TEST_F(LoadingTest, AcceptsAnAnswerInTheNotificationItself) {
   server_.answerWithOutData = true;
   server_.files[u"a.css"] = "b { color: red }";

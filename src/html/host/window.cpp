@@ -18,15 +18,6 @@ namespace {
 // a page that keeps doing so must not hang the window.
 constexpr int kMaxUpdateRounds = 8;
 
-// Most content has no images; then there is no need to walk it for them.
-bool MayHoldImages(std::u16string_view html) {
-  for (std::size_t at = html.find(u'<'); at != std::u16string_view::npos && at + 3 < html.size();
-       at = html.find(u'<', at + 1)) {
-    if ((html[at + 1] | 0x20) == u'i' && (html[at + 2] | 0x20) == u'm' && (html[at + 3] | 0x20) == u'g') return true;
-  }
-  return false;
-}
-
 }  // namespace
 
 Window::Window(WindowHost& host)
@@ -245,12 +236,9 @@ bool Window::SetElementHtml(Element& element, std::u16string_view html, unsigned
   // Content that is replaced goes first: its memory is then warm for the new nodes, and the new
   // nodes are still in the cache when they are inserted and styled.
   if (where == 0) ReleaseChildren(element);
-  auto nodes = parse::ParseFragment(html, where >= 3 ? parent->tag() : element.tag());
-  if (MayHoldImages(html)) {
-    for (auto& node : nodes) {
-      if (Element* added = dom::AsElement(node.get())) RequestImages(*added);
-    }
-  }
+  std::vector<Element*> images;
+  auto nodes = parse::ParseFragment(html, where >= 3 ? parent->tag() : element.tag(), &images);
+  for (Element* image : images) RequestImages(*image);
   switch (where) {
     case 1:
       for (std::size_t i = 0; i < nodes.size(); ++i) element.InsertNodeAt(i, nodes[i]);

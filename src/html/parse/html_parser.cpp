@@ -119,6 +119,8 @@ class TreeBuilder {
 
   // Attributes of an `<html>` tag in a full page go to the document's root.
   bool takeHtmlAttributes = false;
+  // Where the `img` elements made are listed, if anywhere.
+  std::vector<Element*>* images = nullptr;
 
  private:
   Element* current() const { return stack_.back(); }
@@ -303,6 +305,7 @@ class TreeBuilder {
     Ref<Element> element = Element::Create(tag);
     const bool selfClosed = ReadAttributes(*element);
     Element* raw = element.get();
+    if (tag == dom::kAtomImg && images) images->push_back(raw);
     if (IsRawTextElement(tag) && !selfClosed) {
       ReadRawText(*raw);
       // Scripts are never run; they are not kept either.
@@ -384,9 +387,11 @@ void ParseDocument(std::u16string_view html, dom::Document& document) {
   document.SetRoot(std::move(root));
 }
 
-std::vector<Ref<dom::Node>> ParseFragment(std::u16string_view html, dom::Atom contextTag) {
+std::vector<Ref<dom::Node>> ParseFragment(std::u16string_view html, dom::Atom contextTag,
+                                          std::vector<dom::Element*>* images) {
   Ref<Element> holder = Element::Create(contextTag);
   TreeBuilder builder(html, holder.get());
+  builder.images = images;
   builder.Run();
   return holder->RemoveAllChildren();
 }

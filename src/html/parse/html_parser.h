@@ -18,7 +18,9 @@ void ParseDocument(std::u16string_view html, dom::Document& document);
 
 // Parses the content an element of tag `contextTag` gets; the nodes are returned in order,
 // without a parent. A fragment of table rows given to a `table` is read as rows of that table.
-std::vector<dom::Ref<dom::Node>> ParseFragment(std::u16string_view html, dom::Atom contextTag);
+// The `img` elements made are listed in `images` when it is given.
+std::vector<dom::Ref<dom::Node>> ParseFragment(std::u16string_view html, dom::Atom contextTag,
+                                               std::vector<dom::Element*>* images = nullptr);
 
 // Tags with no content and no end tag.
 bool IsVoidElement(dom::Atom tag);
