@@ -133,6 +133,8 @@ struct Attribute {
 // inline style); the dom only owns and frees it.
 class Extension {
  public:
+  static void* operator new(std::size_t size) { return AllocateNodeMemory(size); }
+  static void operator delete(void* memory, std::size_t size) { FreeNodeMemory(memory, size); }
   virtual ~Extension() = default;
 };
 
@@ -149,7 +151,7 @@ struct RareData {
   static void operator delete(void* memory, std::size_t size) { FreeNodeMemory(memory, size); }
 
   std::vector<std::pair<std::u16string, std::u16string>> runtimeStyle;  // set by the program
-  std::vector<AttachedHandler> handlers;
+  NodeVector<AttachedHandler> handlers;
   std::unique_ptr<Extension> parsedInlineStyle;
   std::unique_ptr<Extension> control;
 };

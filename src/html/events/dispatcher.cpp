@@ -53,7 +53,7 @@ bool EventDispatcher::DetachHandler(Element& element, dom::ElementEventProc proc
 void EventDispatcher::DetachAll(Element& element, bool onlyBehaviors) {
   dom::RareData* rare = element.rareIfAny();
   if (!rare || rare->handlers.empty()) return;
-  std::vector<dom::AttachedHandler> gone;
+  dom::NodeVector<dom::AttachedHandler> gone;
   if (onlyBehaviors) {
     auto keep = std::stable_partition(rare->handlers.begin(), rare->handlers.end(),
                                       [](const dom::AttachedHandler& h) { return h.behavior.empty(); });
@@ -74,7 +74,7 @@ bool EventDispatcher::CallHandlers(Element& element, unsigned group, void* param
   dom::RareData* rare = element.rareIfAny();
   if (!rare || rare->handlers.empty()) return false;
   // A handler may attach or detach others while it runs: walk a copy.
-  const std::vector<dom::AttachedHandler> handlers = rare->handlers;
+  const dom::NodeVector<dom::AttachedHandler> handlers = rare->handlers;
   for (const dom::AttachedHandler& handler : handlers) {
     if ((handler.subscription & group) == 0) continue;
     if (handler.proc(handler.tag, &element, group, params)) return true;

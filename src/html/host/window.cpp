@@ -154,7 +154,7 @@ void Window::AttachBehaviors(Element& element) {
   const std::shared_ptr<const css::ComputedStyle> style = element.style();
   const std::vector<std::string>& names = css::BehaviorNames(*style);
   if (dom::RareData* rare = element.rareIfAny()) {
-    std::vector<dom::AttachedHandler> gone;
+    dom::NodeVector<dom::AttachedHandler> gone;
     for (const dom::AttachedHandler& handler : rare->handlers) {
       if (!handler.behavior.empty() && std::find(names.begin(), names.end(), handler.behavior) == names.end()) {
         gone.push_back(handler);
