@@ -3,11 +3,31 @@
 #include <algorithm>
 #include <bit>
 #include <cstdint>
-#include <iterator>
 #include <cstring>
+#include <iterator>
+
+#if defined(__SSE2__)
+#include <emmintrin.h>
+#endif
 
 namespace kestrune {
 namespace {
+
+// Widens the ASCII bytes at the start of `from` (at most `count`) into `to`; answers how many.
+std::size_t WidenAscii(const char* from, std::size_t count, char16_t* to) {
+  std::size_t k = 0;
+#if defined(__SSE2__)
+  const __m128i zero = _mm_setzero_si128();
+  for (; k + 16 <= count; k += 16) {
+    const __m128i chunk = _mm_loadu_si128(reinterpret_cast<const __m128i*>(from + k));
+    if (_mm_movemask_epi8(chunk) != 0) break;
+    _mm_storeu_si128(reinterpret_cast<__m128i*>(to + k), _mm_unpacklo_epi8(chunk, zero));
+    _mm_storeu_si128(reinterpret_cast<__m128i*>(to + k + 8), _mm_unpackhi_epi8(chunk, zero));
+  }
+#endif
+  for (; k < count && static_cast<unsigned char>(from[k]) < 0x80; ++k) to[k] = static_cast<unsigned char>(from[k]);
+  return k;
+}
 
 bool IsHighSurrogate(char32_t unit) { return unit >= 0xD800 && unit <= 0xDBFF; }
 bool IsLowSurrogate(char32_t unit) { return unit >= 0xDC00 && unit <= 0xDFFF; }
@@ -70,28 +90,14 @@ std::u16string DecodeUtf8(std::string_view bytes) {
   while (i < size) {
     const auto lead = static_cast<unsigned char>(bytes[i]);
     if (lead < 0x80) {
-      // A run of ASCII, the bulk of any page: found eight bytes at a time, widened through a
-      // small buffer that stays in the cache.
-      std::size_t end = i + 1;
-      while (end + 8 <= size) {
-        std::uint64_t word;
-        std::memcpy(&word, bytes.data() + end, sizeof word);
-        if (word & 0x8080808080808080ull) break;
-        end += 8;
-      }
-      while (end < size && static_cast<unsigned char>(bytes[end]) < 0x80) ++end;
+      // A run of ASCII, the bulk of any page, widened a block at a time through a small buffer
+      // that stays in the cache.
       char16_t wide[256];
-      while (i < end) {
-        const std::size_t count = std::min(end - i, std::size(wide));
-        std::size_t k = 0;
-        for (; std::endian::native == std::endian::little && k + 8 <= count; k += 8) {
-          std::uint64_t word;
-          std::memcpy(&word, bytes.data() + i + k, sizeof word);
-          for (std::size_t b = 0; b < 8; ++b) wide[k + b] = static_cast<char16_t>((word >> (8 * b)) & 0xFF);
-        }
-        for (; k < count; ++k) wide[k] = static_cast<unsigned char>(bytes[i + k]);
-        out.append(wide, count);
-        i += count;
+      for (;;) {
+        const std::size_t widened = WidenAscii(bytes.data() + i, std::min(size - i, std::size(wide)), wide);
+        out.append(wide, widened);
+        i += widened;
+        if (widened < std::size(wide)) break;  // at a byte beyond ASCII, or at the end
       }
       continue;
     }

@@ -20,8 +20,13 @@ std::uint64_t KeyTable::Hash(const std::uint64_t* key) const {
   return hash;
 }
 
+// Keys are a handful of words: a loop, rather than a call to memcmp.
 bool KeyTable::Equal(std::uint32_t id, const std::uint64_t* key) const {
-  return std::equal(key, key + length_, keys_.begin() + static_cast<std::ptrdiff_t>((id - 1) * length_));
+  const std::uint64_t* stored = keys_.data() + (id - 1) * length_;
+  for (std::size_t i = 0; i < length_; ++i) {
+    if (stored[i] != key[i]) return false;
+  }
+  return true;
 }
 
 std::uint32_t KeyTable::IdOf(const std::uint64_t* key) {
