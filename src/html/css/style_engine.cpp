@@ -288,7 +288,8 @@ void StyleEngine::Visit(dom::Element& element, const std::shared_ptr<const Compu
       element.SetStyle(std::move(fresh));
     }
   }
-  if (forceChildren || (dirty & dom::kChildStyleDirty)) {
+  // Text nodes are not looked at: a cell that holds only text has no children to visit.
+  if ((forceChildren || (dirty & dom::kChildStyleDirty)) && element.elementCount() > 0) {
     for (dom::Node* node : element.nodes()) {
       if (node->IsElement()) Visit(*static_cast<dom::Element*>(node), element.style(), chain, forceChildren, changes, reported);
     }

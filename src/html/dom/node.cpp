@@ -335,6 +335,7 @@ RareData& Element::rare() {
 namespace {
 
 Element* FirstElementFrom(const Element& parent, std::size_t nodeIndex) {
+  if (parent.elementCount() == 0) return nullptr;  // without touching its text nodes
   const auto& nodes = parent.nodes();
   for (std::size_t i = nodeIndex; i < nodes.size(); ++i) {
     if (nodes[i]->IsElement()) return static_cast<Element*>(nodes[i]);
