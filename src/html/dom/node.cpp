@@ -192,17 +192,24 @@ void Element::AppendChild(Ref<Node> child) { InsertNodeAt(children_.size(), std:
 
 void Element::AppendChildren(std::vector<Ref<Node>>& nodes) {
   if (nodes.empty()) return;
-  const std::size_t from = children_.size();
-  children_.reserve(from + nodes.size());
+  children_.reserve(children_.size() + nodes.size());
+  // Numbered as they come; a node moved from this element itself renumbers from its old place.
+  std::size_t renumberFrom = children_.size() + nodes.size();
+  auto elements = static_cast<std::uint32_t>(elementCount());
   for (Ref<Node>& child : nodes) {
     if (!child) continue;
-    if (Element* oldParent = child->parent()) oldParent->RemoveChild(child.get());
+    if (Element* oldParent = child->parent()) {
+      if (oldParent == this) renumberFrom = std::min<std::size_t>(renumberFrom, child->nodeIndex_);
+      oldParent->RemoveChild(child.get());
+    }
     Node* node = child.Leak();
+    node->nodeIndex_ = static_cast<std::uint32_t>(children_.size());
+    if (node->IsElement()) static_cast<Element*>(node)->elementIndex_ = elements++;
     children_.push_back(node);
     Adopt(node);
   }
   nodes.clear();
-  Renumber(from);
+  if (renumberFrom < children_.size()) Renumber(renumberFrom);
   ChildrenChanged();
 }
 
