@@ -11,13 +11,13 @@ void KeyTable::Reset(std::size_t length) {
   std::fill(slots_.begin(), slots_.end(), 0u);
 }
 
-std::uint64_t KeyTable::Hash(const std::uint64_t* key) const {
+std::size_t KeyTable::Hash(const std::uint64_t* key) const {
   std::uint64_t hash = 0x9E3779B97F4A7C15ull;
   for (std::size_t i = 0; i < length_; ++i) {
     hash = (hash ^ key[i]) * 0xBF58476D1CE4E5B9ull;
     hash ^= hash >> 31;
   }
-  return hash;
+  return static_cast<std::size_t>(hash ^ (hash >> 32));
 }
 
 // Keys are a handful of words: a loop, rather than a call to memcmp.

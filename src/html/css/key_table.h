@@ -17,7 +17,7 @@ class KeyTable {
   std::size_t size() const { return count_; }
 
  private:
-  std::uint64_t Hash(const std::uint64_t* key) const;
+  std::size_t Hash(const std::uint64_t* key) const;
   bool Equal(std::uint32_t id, const std::uint64_t* key) const;
   void Grow();
 
