@@ -213,34 +213,6 @@ void Element::AppendChildren(std::vector<Ref<Node>>& nodes) {
   ChildrenChanged();
 }
 
-void Element::AppendParsedChildren(std::vector<Ref<Node>>& nodes) {
-  const bool fresh = parent() == nullptr && children_.empty() &&
-                     std::all_of(nodes.begin(), nodes.end(), [](const Ref<Node>& n) { return n && !n->parent(); });
-  if (!fresh) {
-    AppendChildren(nodes);
-    return;
-  }
-  if (nodes.empty()) return;
-  children_.reserve(nodes.size());
-  std::uint32_t elements = 0;
-  for (Ref<Node>& child : nodes) {
-    Node* node = child.Leak();
-    node->parent_ = this;
-    node->nodeIndex_ = static_cast<std::uint32_t>(children_.size());
-    children_.push_back(node);
-    if (node->IsElement()) {
-      auto* element = static_cast<Element*>(node);
-      element->elementIndex_ = elements++;
-      element->dirty_ = static_cast<std::uint16_t>(element->dirty_ | kStyleDirty | kSubtreeStyleDirty);
-    } else {
-      ++textChildren_;
-    }
-  }
-  nodes.clear();
-  // What AppendChildren would mark on an element without ancestors.
-  dirty_ = static_cast<std::uint16_t>(dirty_ | (elements ? kChildStyleDirty : 0) | kLayoutDirty | kPaintDirty);
-}
-
 void Element::InsertElementAt(std::size_t elementIndex, Ref<Node> child) {
   if (!child) return;
   // Moving within this element: take it out first so that the index means the final place.

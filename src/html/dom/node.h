@@ -197,9 +197,6 @@ class Element : public Node {
   void AppendChild(Ref<Node> child);
   // Appends the nodes, in order, as one change; the list is left empty (with its room).
   void AppendChildren(std::vector<Ref<Node>>& nodes);
-  // The same for the parser, which builds a tree bottom up: an element without parent or
-  // children takes nodes without parents in one pass, with no ancestors to tell.
-  void AppendParsedChildren(std::vector<Ref<Node>>& nodes);
   // Inserts before the element child at elementIndex (appends when past the end).
   void InsertElementAt(std::size_t elementIndex, Ref<Node> child);
   void InsertNodeAt(std::size_t nodeIndex, Ref<Node> child);

@@ -131,7 +131,7 @@ class TreeBuilder {
 
   void PopTo(std::size_t depth) {
     while (stack_.size() > depth) {
-      stack_.back()->AppendParsedChildren(pending_.back());
+      stack_.back()->AppendChildren(pending_.back());
       if (stack_.size() == 1) return;  // the container stays, with its children given
       stack_.pop_back();
       spare_.push_back(std::move(pending_.back()));
