@@ -24,13 +24,13 @@ namespace kestrune {
 
 const bool SizeClassPool::kPoolsByDefault = KESTRUNE_POOLED != 0;
 
-// A block's slots lie in a region of the block's size, aligned to it, whose first cache line
-// points back to the block (the slots start at the next line, so that objects of a multiple of
-// the line's size never straddle more lines than they must): a slot's block is found from the slot's address alone. The block's own
-// fields and free-slot bits live apart on the heap, since the regions' starts all fall on the
-// same cache sets and would evict one another.
 constexpr std::size_t kCacheLine = 64;
 
+// A block's slots lie in a region of the block's size, aligned to it, whose first cache line
+// points back to the block: a slot's block is found from the slot's address alone. The slots
+// start at the next line, so that objects of a multiple of the line's size straddle no more
+// lines than they must. The block's own fields and free-slot bits live apart on the heap, since
+// the regions' starts all fall on the same cache sets and would evict one another.
 struct SizeClassPool::Block {
   static constexpr std::size_t kMaxSlots = kBlockSize / kGranule;
   static constexpr std::size_t kWords = kMaxSlots / 64;

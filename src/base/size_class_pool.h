@@ -11,9 +11,9 @@ namespace kestrune {
 // table, their layout boxes). Each 16-byte size class has blocks of its own, and a bit per slot
 // says whether the slot is free; a slot is always taken from the class's first-made block with
 // a free slot, at the lowest free address there. So objects made one after the other lie one
-// after the other, even when the memory was freed in another order, and walking what was
-// built in order walks memory in order. Freed memory is
-// kept for the next object of its class, never given back. Not thread-safe.
+// after the other, even when the memory was freed in another order, and walking what was built
+// in order walks memory in order. Freed memory is kept for the next object of its class, never
+// given back. Not thread-safe.
 class SizeClassPool {
  public:
   // Sanitizer builds take every object from the heap by default, which checks its lifetime.

@@ -160,6 +160,10 @@ void StyleEngine::CollectMatches(const dom::Element& element) {
   matched_.erase(std::unique(matched_.begin(), matched_.end()), matched_.end());
 }
 
+// A signature starts with the parent's chain, the tag, the tested states and the structural
+// results; the values of the tested attributes follow.
+constexpr std::size_t kSignatureHead = 4;
+
 std::uint32_t StyleEngine::ChainOf(const dom::Element& element, std::uint32_t parentChain) {
   const dom::StyleFeatures& features = document_.features();
   signature_.clear();
@@ -303,7 +307,7 @@ void StyleEngine::Update(StyleChanges* changes) {
   dom::Element* root = document_.root();
   if (!root || !(root->dirty() & (dom::kStyleDirty | dom::kSubtreeStyleDirty | dom::kChildStyleDirty))) return;
   static const std::shared_ptr<const ComputedStyle> kInitial = std::make_shared<const ComputedStyle>();
-  chains_.Reset(4 + document_.features().attributes.size());
+  chains_.Reset(kSignatureHead + document_.features().attributes.size());
   Visit(*root, kInitial, 0, false, changes, false);
   shared_.clear();
   byChain_.clear();

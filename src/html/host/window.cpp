@@ -148,10 +148,10 @@ std::intptr_t Window::Notify(NotificationHeader& header) {
 }
 
 void Window::AttachBehaviors(Element& element) {
-  // An element that left the document while behaviors were being attached lost its style there.
-  if (!element.style()) return;
-  // Held, so that the names stay while handlers run (and may restyle the element).
+  // Held, so that the names stay while handlers run (and may restyle the element). An element
+  // that left the document while behaviors were being attached lost its style there.
   const std::shared_ptr<const css::ComputedStyle> style = element.style();
+  if (!style) return;
   const std::vector<std::string>& names = css::BehaviorNames(*style);
   if (dom::RareData* rare = element.rareIfAny()) {
     dom::NodeVector<dom::AttachedHandler> gone;
